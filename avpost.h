@@ -1,0 +1,15 @@
+#ifndef AVPOST_AVPOST_H
+#define AVPOST_AVPOST_H
+
+// Everything a host needs: the media model, the stages, the exported functions and the
+// image, audio and output functions.
+
+#include "media/AvpostApi.h"
+#include "media/WinTypes.h"
+#include "media/MediaFrame.h"
+#include "media/StreamInfo.h"
+#include "media/Decoder.h"
+#include "media/VideoExports.h"
+#include "video/VideoEvenProcess.h"
+
+#endif

@@ -1,0 +1,27 @@
+#!/usr/bin/env bash
+# Builds and tests the library three ways: x86-64, 32-bit x86 (-m32), and x86-64 with
+# AddressSanitizer and UndefinedBehaviorSanitizer. Exits non-zero on the first failure.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+
+scripts/install-deps.sh
+
+jobs=$(nproc)
+build_root=${AVPOST_BUILD_ROOT:-build}
+
+variant() {
+  local name=$1; shift
+  echo "== ${name} =="
+  cmake -S . -B "${build_root}/${name}" -G Ninja "$@" >/dev/null
+  cmake --build "${build_root}/${name}" -j "${jobs}"
+  ctest --test-dir "${build_root}/${name}" -j "${jobs}" --output-on-failure --no-tests=error
+}
+
+variant x86-64 -DCMAKE_BUILD_TYPE=RelWithDebInfo
+variant i386 -DCMAKE_BUILD_TYPE=RelWithDebInfo \
+  -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchains/i386-linux-gnu.cmake" -DAVPOST_BUILD_BENCHMARKS=OFF
+sanitizers="-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer"
+variant sanitize -DCMAKE_BUILD_TYPE=Debug -DAVPOST_BUILD_BENCHMARKS=OFF \
+  -DCMAKE_CXX_FLAGS="${sanitizers}" -DCMAKE_C_FLAGS="${sanitizers}" \
+  -DCMAKE_EXE_LINKER_FLAGS="${sanitizers}" -DCMAKE_SHARED_LINKER_FLAGS="${sanitizers}"
+echo "All builds passed."

@@ -1,0 +1,47 @@
+// A host program built against the installed library only.
+#include <avpost/avpost.h>
+
+#include <cstdio>
+
+namespace {
+
+class EndlessPictures : public VideoDecoder {
+public:
+    EndlessPictures() : picture_(CreateYV12Frame(8, 8, false, true)), info_()
+    {
+        info_.video.frameRate = 25.0;
+        picture_->streamTime = 0;
+    }
+    ~EndlessPictures() override { ReleaseYV12Frame(picture_); }
+    void Close() override {}
+    int Open(const wchar_t*, const DecParam*, int*) override { return 1; }
+    int SetExDecodeParam(unsigned, unsigned, unsigned) override { return 0; }
+    const STREAM_INFO* GetStreamInfo() const override { return &info_; }
+    double Seek(double, unsigned) override { return 0.0; }
+    double GetOffset() const override { return 0.0; }
+    MEDIA_FRAME* GetFrame() const override { return picture_; }
+    int Forward(int count) override
+    {
+        picture_->streamTime += 400000LL * count;  // 25 pictures per second
+        return 1;
+    }
+
+private:
+    MEDIA_FRAME* picture_;
+    STREAM_INFO info_;
+};
+
+}  // namespace
+
+int main()
+{
+    EndlessPictures decoder;
+    VideoDecoder* stage = PEVideoCreate(&decoder, 50.0);
+    if (stage == nullptr || stage->GetFrame() == nullptr || stage->GetStreamInfo()->video.frameRate != 50.0)
+        return 1;
+    const bool ok = stage->Forward(1) == 1 && stage->GetFrame() != nullptr &&
+                    stage->GetFrame()->startTime == 200000;
+    PEVideoDestroy(stage);
+    std::puts(ok ? "consumer ok" : "consumer failed");
+    return ok ? 0 : 1;
+}
