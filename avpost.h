@@ -12,5 +12,6 @@
 #include "media/VideoExports.h"
 #include "video/VideoEvenProcess.h"
 #include "image/effects/ImageAdjust.h"
+#include "image/effects/ImageFilter.h"
 
 #endif
