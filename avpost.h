@@ -13,5 +13,6 @@
 #include "video/VideoEvenProcess.h"
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
+#include "image/effects/Deinterlace.h"
 
 #endif
