@@ -14,5 +14,6 @@
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
 #include "image/effects/Deinterlace.h"
+#include "image/effects/WaterMark.h"
 
 #endif
