@@ -17,7 +17,7 @@ constexpr int kChromaMax = 240;
 constexpr int kMidLevel = 128;
 
 // Strengths are applied in 64 bits so that extreme values saturate at the clamp instead of
-// overflowing; within the 32-bit range the results are the same.
+// overflowing; wherever 32-bit arithmetic would not overflow the results are the same.
 unsigned char Clamp(int64_t value, int lo, int hi)
 {
     return static_cast<unsigned char>(std::clamp<int64_t>(value, lo, hi));
