@@ -2,41 +2,35 @@
 #define AVPOST_TESTS_IMAGE_EFFECTS_GUARDEDPICTURE_H
 
 #include <algorithm>
-#include <cstring>
 #include <random>
 #include <utility>
 #include <vector>
 
 #include "media/MediaFrame.h"
 
-// A packed YUV 4:2:0 picture (with an alpha plane when asked) whose planes lie in one buffer
-// with guard bytes before, between and after them, so that a write outside any plane shows.
-// Starts black, neutral and opaque.
+// A packed YUV 4:2:0 picture (with alpha when asked), black, neutral and opaque, whose planes lie
+// in one buffer between guard bytes, so that a write outside any plane shows. The pitch fields
+// stay 0: the effects must not read them.
 class GuardedPicture {
 public:
-    GuardedPicture(int width, int height, bool withAlpha = false)
+    GuardedPicture(int width, int height, bool withAlpha = false) : chromaWidth_((width + 1) / 2)
     {
         const size_t luma = static_cast<size_t>(width) * height;
-        const size_t chroma = static_cast<size_t>((width + 1) / 2) * ((height + 1) / 2);
-        const size_t sizes[4] = {luma, chroma, chroma, withAlpha ? luma : 0};
-        const unsigned char initial[4] = {16, 128, 128, 255};
-        size_t offsets[4];
+        const size_t chroma = static_cast<size_t>(chromaWidth_) * ((height + 1) / 2);
         size_t end = kGuard;
-        for (int i = 0; i < 4; ++i) {
-            offsets[i] = end;
-            end += sizes[i] + kGuard;
+        for (size_t size : {luma, chroma, chroma, withAlpha ? luma : 0}) {
+            planes_.emplace_back(end, size);
+            end += size + kGuard;
         }
         buffer_.assign(end, kGuardByte);
+        const unsigned char initial[4] = {16, 128, 128, 255};
         for (int i = 0; i < 4; ++i) {
-            std::memset(buffer_.data() + offsets[i], initial[i], sizes[i]);
-            planes_.emplace_back(offsets[i], sizes[i]);
-            frame_.plane[i] = sizes[i] != 0 ? buffer_.data() + offsets[i] : nullptr;
+            std::fill_n(buffer_.begin() + planes_[i].first, planes_[i].second, initial[i]);
+            frame_.plane[i] = planes_[i].second != 0 ? &buffer_[planes_[i].first] : nullptr;
         }
         frame_.type = 2;
         frame_.width = width;
         frame_.height = height;
-        frame_.pitch[0] = width;
-        frame_.pitch[1] = frame_.pitch[2] = (width + 1) / 2;
     }
     // Moving keeps the buffer, so the plane pointers stay valid; a copy would not.
     GuardedPicture(GuardedPicture&&) = default;
@@ -44,11 +38,15 @@ public:
     GuardedPicture& operator=(const GuardedPicture&) = delete;
 
     MEDIA_FRAME* frame() { return &frame_; }
-    // Sample access; chroma by chroma coordinates.
+    // Chroma samples by chroma coordinates.
     unsigned char& Y(int x, int y) { return frame_.plane[0][y * frame_.width + x]; }
-    unsigned char& U(int x, int y) { return frame_.plane[1][y * ((frame_.width + 1) / 2) + x]; }
-    unsigned char& V(int x, int y) { return frame_.plane[2][y * ((frame_.width + 1) / 2) + x]; }
-    unsigned char& A(int x, int y) { return frame_.plane[3][y * frame_.width + x]; }
+    unsigned char& U(int x, int y) { return frame_.plane[1][y * chromaWidth_ + x]; }
+    unsigned char& V(int x, int y) { return frame_.plane[2][y * chromaWidth_ + x]; }
+    std::vector<int> Plane(int index) const
+    {
+        const auto start = buffer_.begin() + planes_[index].first;
+        return std::vector<int>(start, start + planes_[index].second);
+    }
 
     void Randomize(unsigned seed)
     {
@@ -60,22 +58,26 @@ public:
     const std::vector<unsigned char>& Bytes() const { return buffer_; }
     bool GuardsIntact() const
     {
-        size_t expectedStart = 0;
+        size_t start = 0;
         for (auto [offset, size] : planes_) {
-            if (std::any_of(buffer_.begin() + expectedStart, buffer_.begin() + offset,
-                            [](unsigned char b) { return b != kGuardByte; }))
+            if (!IsGuard(start, offset))
                 return false;
-            expectedStart = offset + size;
+            start = offset + size;
         }
-        return std::all_of(buffer_.begin() + expectedStart, buffer_.end(),
-                           [](unsigned char b) { return b == kGuardByte; });
+        return IsGuard(start, buffer_.size());
     }
 
 private:
+    bool IsGuard(size_t from, size_t to) const
+    {
+        return std::all_of(buffer_.begin() + from, buffer_.begin() + to, [](unsigned char b) { return b == kGuardByte; });
+    }
+
     static constexpr size_t kGuard = 32;
     static constexpr unsigned char kGuardByte = 0xA5;
+    int chromaWidth_;
     std::vector<unsigned char> buffer_;
-    std::vector<std::pair<size_t, size_t>> planes_;
+    std::vector<std::pair<size_t, size_t>> planes_;  // offset and size of Y, U, V, alpha
     MEDIA_FRAME frame_{};
 };
 

@@ -68,36 +68,25 @@ TEST(PictureAdjustments, ZeroStrengthsLeaveEveryByte)
 TEST(PictureAdjustments, OddSizeChromaCoverageDiffersBetweenContrastAndSaturation)
 {
     GuardedPicture contrast(5, 5), saturation(5, 5);
-    for (GuardedPicture* p : {&contrast, &saturation})
-        for (int y = 0; y < 3; ++y)
-            for (int x = 0; x < 3; ++x)
-                p->U(x, y) = p->V(x, y) = 200;
+    std::fill_n(contrast.frame()->plane[1], 9, 200);
+    std::fill_n(saturation.frame()->plane[2], 9, 200);
     AdjustImage(contrast.frame(), 0, 100, 0);
     AdjustImage(saturation.frame(), 0, 0, 10);
-    for (int y = 0; y < 3; ++y)
-        for (int x = 0; x < 3; ++x) {
-            EXPECT_EQ(contrast.U(x, y), 240);
-            EXPECT_EQ(contrast.V(x, y), 240);
-            const int expected = x < 2 && y < 2 ? 221 : 200;
-            EXPECT_EQ(saturation.U(x, y), expected) << x << "," << y;
-            EXPECT_EQ(saturation.V(x, y), expected) << x << "," << y;
-        }
+    EXPECT_EQ(contrast.Plane(1), std::vector<int>(9, 240));
+    EXPECT_EQ(saturation.Plane(2), (std::vector<int>{221, 221, 200, 221, 221, 200, 200, 200, 200}));
     EXPECT_TRUE(contrast.GuardsIntact());
     EXPECT_TRUE(saturation.GuardsIntact());
 }
 
 TEST(PictureAdjustments, PlaneLevelWalksEachPlaneWithItsOwnPitch)
 {
-    // 4 x 2 picture; padding bytes hold 7, which any touch would clamp.
-    std::vector<unsigned char> y(7 * 2, 7), u(3, 7), v(5, 7);
-    for (int r = 0; r < 2; ++r)
-        std::fill_n(y.begin() + r * 7, 4, 100);
-    std::fill_n(u.begin(), 2, 160);
-    std::fill_n(v.begin(), 2, 160);
-    AdjustImage(y.data(), u.data(), v.data(), 7, 3, 5, 4, 2, 10, 0, -100);
-    EXPECT_EQ(y, (std::vector<unsigned char>{110, 110, 110, 110, 7, 7, 7, 110, 110, 110, 110, 7, 7, 7}));
-    EXPECT_EQ(u, (std::vector<unsigned char>{128, 128, 7}));
-    EXPECT_EQ(v, (std::vector<unsigned char>{128, 128, 7, 7, 7}));
+    // A 2 x 4 picture; padding holds 7, which any touch would clamp.
+    std::vector<unsigned char> y = {100, 100, 7, 100, 100, 7, 100, 100, 7, 100, 100, 7};
+    std::vector<unsigned char> u = {160, 7, 160, 7}, v = {160, 7, 7, 160, 7, 7};
+    AdjustImage(y.data(), u.data(), v.data(), 3, 2, 3, 2, 4, 10, 0, -100);
+    EXPECT_EQ(y, (std::vector<unsigned char>{110, 110, 7, 110, 110, 7, 110, 110, 7, 110, 110, 7}));
+    EXPECT_EQ(u, (std::vector<unsigned char>{128, 7, 128, 7}));
+    EXPECT_EQ(v, (std::vector<unsigned char>{128, 7, 7, 128, 7, 7}));
 }
 
 }  // namespace
