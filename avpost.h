@@ -11,5 +11,9 @@
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
 #include "video/VideoEvenProcess.h"
+#include "image/effects/ImageAdjust.h"
+#include "image/effects/ImageFilter.h"
+#include "image/effects/Deinterlace.h"
+#include "image/effects/WaterMark.h"
 
 #endif
