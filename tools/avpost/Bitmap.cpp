@@ -55,8 +55,11 @@ Bitmap32 LoadBmp(const std::string& path)
 {
     InputFile file(path);
     unsigned char header[kFileHeaderBytes + kInfoHeaderBytes];
-    if (!file.ReadExactly(header, sizeof(header), "BMP header") || std::memcmp(header, "BM", 2) != 0)
+    const size_t got = file.Read(header, sizeof(header));
+    if (got < 2 || std::memcmp(header, "BM", 2) != 0)
         Fail(path, "not a BMP file");
+    if (got < sizeof(header))
+        Fail(path, "truncated BMP header");
     const uint32_t dataOffset = Le32(header + 10);
     const auto width = static_cast<int32_t>(Le32(header + 18));
     const auto rawHeight = static_cast<int32_t>(Le32(header + 22));

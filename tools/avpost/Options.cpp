@@ -300,6 +300,18 @@ size_t ApplyOption(Invocation& call, const std::vector<std::string>& args, size_
     return used;
 }
 
+// --help anywhere before "--" wins over everything else on the line, mistakes included.
+bool AsksForHelp(const std::vector<std::string>& args)
+{
+    for (const std::string& arg : args) {
+        if (arg == "--")
+            return false;
+        if (arg == "--help" || arg == "-h")
+            return true;
+    }
+    return false;
+}
+
 void Place(Invocation& call, std::vector<std::string>& positional)
 {
     const size_t wanted = call.command == Command::Demo ? 1 : 2;
@@ -330,6 +342,11 @@ Invocation ParseCommandLine(const std::vector<std::string>& args)
     }
     if (call.command == Command::Version)
         return call;
+    if (AsksForHelp(args)) {
+        call.command = Command::Help;
+        call.helpTopic = args[0];
+        return call;
+    }
 
     std::vector<std::string> positional;
     bool optionsEnded = false;
@@ -341,10 +358,6 @@ Invocation ParseCommandLine(const std::vector<std::string>& args)
         } else if (arg == "--") {
             optionsEnded = true;
             ++at;
-        } else if (arg == "--help" || arg == "-h") {
-            Invocation help;
-            help.helpTopic = args[0];
-            return help;
         } else if (arg == "--quiet" || arg == "-q") {
             call.quiet = true;
             ++at;
