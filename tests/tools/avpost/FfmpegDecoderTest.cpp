@@ -13,7 +13,7 @@
 namespace avpost::tool {
 namespace {
 
-using testing::Run;
+using testing::RunProgram;
 using testing::TempDir;
 
 // Media files made once by FFmpeg's own command-line tool from its test sources.
@@ -33,7 +33,8 @@ protected:
               File("late-sound.mkv")});
         Make({"-f", "lavfi", "-i", "sine=duration=0.2", File("sound-only.wav")});
         Make({"-f", "lavfi", "-i", "color=c=red@0.5:s=6x4,format=rgba", "-frames:v", "1", File("half.png")});
-        Make({"-f", "lavfi", "-i", "testsrc2=s=7x3", "-frames:v", "1", "-pix_fmt", "bgr24", File("rgb.bmp")});
+        Make({"-f", "lavfi", "-i", "testsrc2=s=8x4", "-vf", "scale=7:3", "-frames:v", "1", "-pix_fmt", "bgr24",
+              File("rgb.bmp")});  // rows of 21 bytes, padded to 24
         testing::WriteWholeFile(File("notes.txt"), "just some words, not a picture");
     }
     static void TearDownTestSuite()
@@ -53,7 +54,7 @@ protected:
     {
         std::vector<std::string> command{"ffmpeg", "-hide_banner", "-loglevel", "error", "-y"};
         command.insert(command.end(), arguments.begin(), arguments.end());
-        ASSERT_EQ(Run(command).exitCode, 0) << arguments.back();
+        ASSERT_EQ(RunProgram(command).exitCode, 0) << arguments.back();
     }
 
     template <typename Decoder>
@@ -146,8 +147,9 @@ TEST_F(FfmpegFiles, AudioBlocksAreSixteenBitAndCoverTheStream)
         EXPECT_EQ(block->bitsPerSample, 16);
         EXPECT_EQ(block->param1, 44100);
         EXPECT_EQ(block->param2, 2);
-        if (nextStart >= 0)
+        if (nextStart >= 0) {
             EXPECT_NEAR(static_cast<double>(block->startTime), static_cast<double>(nextStart), 1.0);
+        }
         nextStart = block->startTime + block->duration;
         bytes += block->dataSize;
     }

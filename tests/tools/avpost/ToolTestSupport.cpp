@@ -62,7 +62,7 @@ std::vector<std::string> TempDir::List() const
     return names;
 }
 
-RunResult Run(const std::vector<std::string>& command, const std::string& stdinFile)
+RunResult RunProgram(const std::vector<std::string>& command, const std::string& stdinFile)
 {
     TempDir capture;
     const std::string outPath = capture.File("out");
@@ -93,7 +93,7 @@ RunResult Run(const std::vector<std::string>& command, const std::string& stdinF
 
 bool HaveProgram(const std::string& name)
 {
-    return Run({name, "-version"}).exitCode == 0;
+    return RunProgram({name, "-version"}).exitCode == 0;
 }
 
 std::string ReadWholeFile(const std::string& path)
@@ -117,7 +117,7 @@ bool FileExists(const std::string& path)
 
 std::string Probe(const std::string& path, const std::string& streamType, const std::string& entry)
 {
-    const RunResult result = Run({"ffprobe", "-v", "error", "-count_frames", "-select_streams", streamType + ":0",
+    const RunResult result = RunProgram({"ffprobe", "-v", "error", "-count_frames", "-select_streams", streamType + ":0",
                                   "-show_entries", "stream=" + entry, "-of", "default=noprint_wrappers=1:nokey=1",
                                   path});
     std::string value = result.exitCode == 0 ? result.out : "";

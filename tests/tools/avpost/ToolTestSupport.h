@@ -31,7 +31,7 @@ struct RunResult {
 
 // Runs a program found on PATH (or by its path) with arguments, no shell involved; standard
 // input is empty unless stdinFile names a file to read it from.
-RunResult Run(const std::vector<std::string>& command, const std::string& stdinFile = "");
+RunResult RunProgram(const std::vector<std::string>& command, const std::string& stdinFile = "");
 
 // True when a program is on PATH.
 bool HaveProgram(const std::string& name);
