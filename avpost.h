@@ -11,5 +11,15 @@
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
 #include "video/VideoEvenProcess.h"
+#include "image/resize/ImgParam.h"
+#include "image/resize/ImageResize.h"
+#include "image/resize/DibResizeKernels.h"
+#include "image/resize/LumaResizeKernels.h"
+#include "image/resize/ChromaResizeKernels.h"
+#include "image/resize/AveragingResizeKernel.h"
+#include "image/resize/BicubicResizeKernel.h"
+#include "image/resize/AlphaMaskResizeKernels.h"
+#include "image/resize/ResizeGeometry.h"
+#include "image/resize/YuvFrameResize.h"
 
 #endif
