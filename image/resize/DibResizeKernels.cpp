@@ -70,9 +70,11 @@ int DIB_ResizeBiLiner(const IMG_PARAM& src, IMG_PARAM& dst)
             unsigned char* pixel = out + column * kRgbaBytes;
             const int32_t left = tap.left * kRgbaBytes;
             const int32_t right = tap.right * kRgbaBytes;
-            for (int k = 0; k < kColourBytes; ++k)
-                pixel[k] = static_cast<unsigned char>(Bilerp(tap.upper[left + k], tap.upper[right + k],
-                                                             tap.lower[left + k], tap.lower[right + k], tap.wx, tap.wy));
+            for (int k = 0; k < kColourBytes; ++k) {
+                pixel[k] = static_cast<unsigned char>(
+                    Bilerp(tap.upper[left + k], tap.upper[right + k], tap.lower[left + k], tap.lower[right + k], tap.wx,
+                           tap.wy));
+            }
             pixel[kColourBytes] = tap.upper[left + kColourBytes];
         },
         CopyRgbaPixel);

@@ -1,7 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
-
 #include "image/resize/AlphaMaskResizeKernels.h"
 #include "image/resize/BicubicResizeKernel.h"
 #include "image/resize/ChromaResizeKernels.h"
@@ -12,61 +10,38 @@
 
 namespace {
 
-using Dispatcher = int (*)(const IMG_PARAM&, IMG_PARAM&, IMAGE_INTERPOLATION);
 using Kernel = int (*)(const IMG_PARAM&, IMG_PARAM&);
-
-struct DispatchCase {
-    const char* name;
-    Dispatcher dispatcher;
-    int interpolation;
-    Kernel expected;  // null: refused
-};
-
-const DispatchCase kCases[] = {
-    {"ImageResize", ImageResize, 0, DIB_ResizeBiLiner},
-    {"ImageResize", ImageResize, 1, DIB_ResizeNear},
-    {"ImageResize", ImageResize, 2, DIB_ResizeBiLiner},
-    {"ImageResize", ImageResize, 3, DIB_ResizeConvolve},
-    {"ImageResize", ImageResize, 4, nullptr},
-    {"ImageResize", ImageResize, -1, nullptr},
-    {"ImageResizeY", ImageResizeY, 0, DIB_ResizeBiLinerY},
-    {"ImageResizeY", ImageResizeY, 1, DIB_ResizeNearY},
-    {"ImageResizeY", ImageResizeY, 2, DIB_ResizeBiLinerY},
-    {"ImageResizeY", ImageResizeY, 3, nullptr},
-    {"ImageResizeUV", ImageResizeUV, 0, DIB_ResizeBiLinerUV},
-    {"ImageResizeUV", ImageResizeUV, 1, DIB_ResizeNearUV},
-    {"ImageResizeUV", ImageResizeUV, 2, DIB_ResizeBiLinerUV},
-    {"ImageResizeUV", ImageResizeUV, 3, nullptr},
-    {"ImageResize8", ImageResize8, 0, DIB_ResizeBiLiner8},
-    {"ImageResize8", ImageResize8, 1, DIB_ResizeNear8},
-    {"ImageResize8", ImageResize8, 2, DIB_ResizeBiLiner8},
-    {"ImageResize8", ImageResize8, 7, nullptr},
-    {"ImageAlphaResize", ImageAlphaResize, 1, DIB_AlphaResizeBiLiner},
-    {"ImageAlphaResize", ImageAlphaResize, 3, DIB_AlphaResizeBiLiner},
-    {"ImageAlphaResize", ImageAlphaResize, 9, DIB_AlphaResizeBiLiner},
-    {"ImageStretchMask", ImageStretchMask, 1, StretchMaskResizeBiLiner},
-    {"ImageStretchMask", ImageStretchMask, 3, StretchMaskResizeBiLiner},
-    {"ImageStretchMask", ImageStretchMask, -1, StretchMaskResizeBiLiner},
-};
 
 TEST(ResizeDispatch, EachInterpolationLeadsToItsKernelOrIsRefused)
 {
+    const struct {
+        int (*dispatcher)(const IMG_PARAM&, IMG_PARAM&, IMAGE_INTERPOLATION);
+        Kernel byInterpolation[5];  // 0 ... 3 and an unknown value; null: refused
+    } cases[] = {
+        {ImageResize, {DIB_ResizeBiLiner, DIB_ResizeNear, DIB_ResizeBiLiner, DIB_ResizeConvolve, nullptr}},
+        {ImageResizeY, {DIB_ResizeBiLinerY, DIB_ResizeNearY, DIB_ResizeBiLinerY, nullptr, nullptr}},
+        {ImageResizeUV, {DIB_ResizeBiLinerUV, DIB_ResizeNearUV, DIB_ResizeBiLinerUV, nullptr, nullptr}},
+        {ImageResize8, {DIB_ResizeBiLiner8, DIB_ResizeNear8, DIB_ResizeBiLiner8, nullptr, nullptr}},
+        {ImageAlphaResize, {DIB_AlphaResizeBiLiner, DIB_AlphaResizeBiLiner, DIB_AlphaResizeBiLiner,
+                            DIB_AlphaResizeBiLiner, DIB_AlphaResizeBiLiner}},
+        {ImageStretchMask, {StretchMaskResizeBiLiner, StretchMaskResizeBiLiner, StretchMaskResizeBiLiner,
+                            StretchMaskResizeBiLiner, StretchMaskResizeBiLiner}},
+    };
     TestPicture src(12, 10, 4);
     src.Randomise(21);
     IMG_PARAM srcRect = src.Rect(1, 1, 9, 7);
-    srcRect.nBitCount = 8;  // the mask kernel reads one byte per mask pixel
-    for (const DispatchCase& c : kCases) {
-        SCOPED_TRACE(std::string(c.name) + " with " + std::to_string(c.interpolation));
-        TestPicture viaDispatcher(12, 10, 4, 0x33);
-        IMG_PARAM dstRect = viaDispatcher.Rect(2, 1, 6, 5);
-        const int result = c.dispatcher(srcRect, dstRect, static_cast<IMAGE_INTERPOLATION>(c.interpolation));
-        TestPicture direct(12, 10, 4, 0x33);
-        if (c.expected != nullptr) {
-            IMG_PARAM directRect = direct.Rect(2, 1, 6, 5);
-            ASSERT_EQ(c.expected(srcRect, directRect), 1);
+    srcRect.nBitCount = 8;  // masks are read a byte per pixel
+    for (size_t d = 0; d < std::size(cases); ++d) {
+        for (int interpolation : {0, 1, 2, 3, 4, -1}) {
+            SCOPED_TRACE("dispatcher " + std::to_string(d) + ", interpolation " + std::to_string(interpolation));
+            const bool known = interpolation >= 0 && interpolation < 4;
+            const Kernel expected = cases[d].byInterpolation[known ? interpolation : 4];
+            TestPicture viaDispatcher(12, 10, 4, 0x33), direct(12, 10, 4, 0x33);
+            IMG_PARAM dstRect = viaDispatcher.Rect(2, 1, 6, 5), directRect = direct.Rect(2, 1, 6, 5);
+            EXPECT_EQ(cases[d].dispatcher(srcRect, dstRect, static_cast<IMAGE_INTERPOLATION>(interpolation)),
+                      expected != nullptr ? expected(srcRect, directRect) : 0);
+            EXPECT_EQ(viaDispatcher.Contents(), direct.Contents());
         }
-        EXPECT_EQ(result, c.expected != nullptr ? 1 : 0);
-        EXPECT_EQ(viaDispatcher.Contents(), direct.Contents());
     }
 }
 

@@ -2,19 +2,15 @@
 #define AVPOST_TESTS_IMAGE_RESIZE_TESTPICTURE_H
 
 #include <algorithm>
-#include <cstdint>
 #include <random>
 #include <vector>
 
 #include "image/resize/ImgParam.h"
 
-// A picture buffer for kernel tests: `guard` bytes of 0xA5 before and after the rows catch
-// writes outside the picture; with guard 0 the rows fill the allocation exactly, so the
-// sanitizer build catches reads past the end.
+// A picture buffer for kernel tests between `guard` bytes of 0xA5 that catch stray writes. With
+// guard 0 the rows fill the allocation exactly, so the sanitizer build catches stray reads.
 class TestPicture {
 public:
-    static constexpr unsigned char kGuard = 0xA5;
-
     TestPicture(int width, int height, int pixelBytes, unsigned char fill = 0, int guard = 64, int padding = 0)
         : width_(width), height_(height), pixelBytes_(pixelBytes), pitch_(width * pixelBytes + padding), guard_(guard),
           storage_(static_cast<size_t>(guard), kGuard)
@@ -23,29 +19,23 @@ public:
         storage_.insert(storage_.end(), static_cast<size_t>(guard), kGuard);
     }
 
-    unsigned char* Bits() { return storage_.data() + guard_; }
     int Pitch() const { return pitch_; }
-    // Byte `offset` of memory row `row` (the first row in memory is 0).
-    unsigned char& At(int row, int offset) { return Bits()[row * pitch_ + offset]; }
-    // The same for picture row `row` of a bottom-up buffer.
+    // Byte `offset` of memory row `row`, or of picture row `row` of a bottom-up buffer.
+    unsigned char& At(int row, int offset) { return storage_[guard_ + row * pitch_ + offset]; }
     unsigned char& AtBottomUp(int row, int offset) { return At(height_ - 1 - row, offset); }
 
     IMG_PARAM Rect(int x, int y, int cx, int cy)
     {
-        return {Bits(), width_, height_, pitch_, pixelBytes_ * 8, x, y, cx, cy};
+        return {storage_.data() + guard_, width_, height_, pitch_, pixelBytes_ * 8, x, y, cx, cy};
     }
     IMG_PARAM Whole() { return Rect(0, 0, width_, height_); }
 
-    void Randomise(uint32_t seed)
+    void Randomise(unsigned seed)
     {
         std::mt19937 random(seed);
-        std::generate(storage_.begin() + guard_, storage_.end() - guard_,
-                      [&random] { return static_cast<unsigned char>(random()); });
+        std::generate(storage_.begin() + guard_, storage_.end() - guard_, [&] { return random() & 0xFF; });
     }
-    std::vector<unsigned char> Contents() const
-    {
-        return {storage_.begin() + guard_, storage_.end() - guard_};
-    }
+    std::vector<unsigned char> Contents() const { return {storage_.begin() + guard_, storage_.end() - guard_}; }
     bool GuardsIntact() const
     {
         auto isGuard = [](unsigned char b) { return b == kGuard; };
@@ -54,11 +44,8 @@ public:
     }
 
 private:
-    int width_;
-    int height_;
-    int pixelBytes_;
-    int pitch_;
-    int guard_;
+    static constexpr unsigned char kGuard = 0xA5;
+    int width_, height_, pixelBytes_, pitch_, guard_;
     std::vector<unsigned char> storage_;
 };
 
