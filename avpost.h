@@ -11,5 +11,6 @@
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
 #include "video/VideoEvenProcess.h"
+#include "Common/Image/ImageConvert.h"
 
 #endif
