@@ -65,6 +65,9 @@ const Case kCases[] = {
     // V samples at chroma column 5 lie beyond pV + (0 + 2) * 1.
     {"PackedToPlanarBeyondV", [] { YUY2_2_Yuv420(b, b, b, 16, 1, 1, 10, 0, 2, 2, b, 4, 1, 0, 0); },
      "(char*)V <= ((char*)pV + (ySrc + cy) * nPt_V)"},
+    // With rows going down in memory the first chroma row holds the highest V address.
+    {"PackedToPlanarUpwardV", [] { YUY2_2_Yuv420(b, b, b + 32, 16, 1, -1, 0, 0, 2, 4, b, 4, 1, 0, -3); },
+     "(char*)V <= ((char*)pV + (ySrc + cy) * nPt_V)"},
     {"PackedToRgbNullDst", [] { YUY2_2_Rgb24(nullptr, 2, 8, 0, 0, 2, 2, b, 4, 1, 0, 0); }, kPackedBuffers},
     {"RgbToPackedNullSrc", [] { Rgb24_2_YUY2(b, 8, 0, 0, 2, 2, 1, nullptr, 2, 8, 0, 0); }, kPackedBuffers},
     {"RgbToPackedNarrowDst", [] { Rgb24_2_YUY2(b, 8, 1, 0, 4, 1, 1, b, 1, 30, 0, 0); },
