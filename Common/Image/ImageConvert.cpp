@@ -62,6 +62,21 @@ void YuvToRgbBitmap(const tagBITMAPINFOHEADER& header, unsigned char* bits, cons
                                     header.biHeight, bitsPerPixel / 8, fourth);
 }
 
+// The checks of the members that read, or write, a 32-bit bitmap, in their documented order.
+void CheckRgb32Source(const tagBITMAPINFOHEADER* lpSrcBmi, const unsigned char* lpSrcBits, const unsigned char* pY,
+                      const unsigned char* pU, const unsigned char* pV)
+{
+    AVPOST_CONVERT_CHECK(lpSrcBmi && lpSrcBmi->biBitCount == 32);
+    AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
+}
+
+void CheckRgb32Destination(const tagBITMAPINFOHEADER* lpDstBmi, const unsigned char* lpDstBits,
+                           const unsigned char* pY, const unsigned char* pU, const unsigned char* pV)
+{
+    AVPOST_CONVERT_CHECK(lpDstBmi && lpDstBmi->biBitCount == 32);
+    AVPOST_CONVERT_CHECK(lpDstBits && pY && pU && pV);
+}
+
 bool AnyNull(const void* a, const void* b, const void* c, const void* d, const void* e)
 {
     return !a || !b || !c || !d || !e;
@@ -94,9 +109,7 @@ void Rgb24_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int
 void Rgb32_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
                     tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits)
 {
-    AVPOST_CONVERT_CHECK(lpSrcBmi && lpSrcBmi->biBitCount == 32);
-    AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
-    RgbBitmapToYuv(Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), *lpSrcBmi, lpSrcBits, 32, true);
+    Rgb32_2_yuv420A_R(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV, lpSrcBmi, lpSrcBits);
 }
 
 void Rgb24_2_yuv420Simple(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
@@ -121,8 +134,7 @@ void Yuv420_2_rgb24(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, uns
 void Yuv420_2_rgb32(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, unsigned char* pY, unsigned char* pU,
                     unsigned char* pV, int nPitchY, int nPitchU, int nPitchV)
 {
-    AVPOST_CONVERT_CHECK(lpDstBmi && lpDstBmi->biBitCount == 32);
-    AVPOST_CONVERT_CHECK(lpDstBits && pY && pU && pV);
+    CheckRgb32Destination(lpDstBmi, lpDstBits, pY, pU, pV);
     YuvToRgbBitmap(*lpDstBmi, lpDstBits, Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), 32, true,
                    FourthByte::Keep);
 }
@@ -150,8 +162,7 @@ void PixelYUV_2_RGB(int Y, int U, int V, int& R, int& G, int& B)
 void Argb_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
                    tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits)
 {
-    AVPOST_CONVERT_CHECK(lpSrcBmi && lpSrcBmi->biBitCount == 32);
-    AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
+    CheckRgb32Source(lpSrcBmi, lpSrcBits, pY, pU, pV);
     RgbBitmapToYuv(Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), *lpSrcBmi, lpSrcBits, 32, false);
 }
 
@@ -185,16 +196,14 @@ void Rgb32_2_yuv420A(unsigned char* pY, unsigned char* pU, unsigned char* pV, un
 void Rgb32_2_yuv420A_R(unsigned char* pY, unsigned char* pU, unsigned char* pV, unsigned char* pA, int nPitchY,
                        int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits)
 {
-    AVPOST_CONVERT_CHECK(lpSrcBmi && lpSrcBmi->biBitCount == 32);
-    AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
+    CheckRgb32Source(lpSrcBmi, lpSrcBits, pY, pU, pV);
     RgbBitmapToYuv(Planes(pY, pU, pV, pA, nPitchY, nPitchU, nPitchV), *lpSrcBmi, lpSrcBits, 32, true);
 }
 
 void Yuv420_2_Argb(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, unsigned char* pY, unsigned char* pU,
                    unsigned char* pV, int nPitchY, int nPitchU, int nPitchV)
 {
-    AVPOST_CONVERT_CHECK(lpDstBmi && lpDstBmi->biBitCount == 32);
-    AVPOST_CONVERT_CHECK(lpDstBits && pY && pU && pV);
+    CheckRgb32Destination(lpDstBmi, lpDstBits, pY, pU, pV);
     YuvToRgbBitmap(*lpDstBmi, lpDstBits, Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), 32, false,
                    FourthByte::Opaque);
 }

@@ -109,9 +109,9 @@ AVPOST_API void YUY2_2_Rgb24(unsigned char* lpBitsDst, int nHeightDst, int nPitc
 AVPOST_API void Rgb24_2_YUY2(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cxDst, int cyDst,
                              unsigned int bYUY2, unsigned char* lpBitsSrc, int nHeightSrc, int nPitchSrc, int xSrc,
                              int ySrc);
-// Copies a planar 4:2:0 rectangle: cx luma columns of cy rows, and the chroma samples that lie
-// wholly inside both rectangles from chroma column (x + 1) / 2, (cy + 1) / 2 chroma rows from
-// chroma row y / 2.
+// Copies a planar 4:2:0 rectangle: cx luma bytes of each of cy rows, and (cy + 1) / 2 chroma rows
+// from chroma row y / 2, each starting at chroma column (x + 1) / 2 and holding the chroma samples
+// up to the last one under the luma rectangle in both pictures. Buffers must not overlap.
 AVPOST_API void YV12_Blt_fast(unsigned char* pYDst, unsigned char* pUDst, unsigned char* pVDst, int nPitchYDst,
                               int nPitchUDst, int nPitchVDst, int xDst, int yDst, int cx, int cy,
                               unsigned char* pYSrc, unsigned char* pUSrc, unsigned char* pVSrc, int nPitchYSrc,

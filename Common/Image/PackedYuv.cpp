@@ -101,11 +101,6 @@ void RowPairToPlanar(const PackedRow& top, const PackedRow& bottom, int x, int c
         ColumnsToPlanar(top, bottom, x, c, 1, y0, y1, u, v);
 }
 
-void PutTableRgb(const PackedRow& in, int p, const ChromaTerms& t, unsigned char* bgr)
-{
-    TableYuvToBgr(in.Y(p), t, bgr);
-}
-
 ChromaTerms GroupTerms(const PackedRow& in, int p)
 {
     return TableChromaTerms(in.U(p), in.V(p));
@@ -116,7 +111,7 @@ void PutLonePixel(const PackedRow& out, int p, const LumaChroma& a)
     out.PutPixel(p, a.y, ChromaOf1(a.du), ChromaOf1(a.dv));
 }
 
-// Columns whose chroma sample, counted from (x + 1) / 2, lies under a luma span [x, x + cx).
+// How many chroma columns, from (x + 1) / 2 on, cover luma columns of the span [x, x + cx).
 int ChromaColumnsUnder(int x, int cx)
 {
     return (x + cx + 1) / 2 - (x + 1) / 2;
@@ -174,17 +169,17 @@ void PackedToRgb24(const RgbRect& dst, const PackedRect& src, int cx, int cy)
         unsigned char* out = RowStart(dst, r);
         int c = 0;
         if (src.x & 1) {
-            PutTableRgb(in, src.x, GroupTerms(in, src.x), out);
+            TableYuvToBgr(in.Y(src.x), GroupTerms(in, src.x), out);
             c = 1;
         }
         for (; c + 1 < cx; c += 2) {
             const int p = src.x + c;
             const ChromaTerms t = GroupTerms(in, p);
-            PutTableRgb(in, p, t, out + 3 * c);
-            PutTableRgb(in, p + 1, t, out + 3 * c + 3);
+            TableYuvToBgr(in.Y(p), t, out + 3 * c);
+            TableYuvToBgr(in.Y(p + 1), t, out + 3 * c + 3);
         }
         if (c < cx)
-            PutTableRgb(in, src.x + c, GroupTerms(in, src.x + c), out + 3 * c);
+            TableYuvToBgr(in.Y(src.x + c), GroupTerms(in, src.x + c), out + 3 * c);
     }
 }
 

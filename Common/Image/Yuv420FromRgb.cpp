@@ -1,3 +1,4 @@
+#include "Common/Image/BlockWalk.h"
 #include "Common/Image/ColourArithmetic.h"
 #include "Common/Image/ConvertKernels.h"
 
@@ -5,28 +6,52 @@ namespace avpost::detail {
 
 namespace {
 
-// Table-path conversion of packed pixels into planar YUV 4:2:0: whole 2 x 2 blocks first, then
-// the edge column of an odd width, the edge row of an odd height and the corner.
+// Table-path conversion of packed pixels into planar YUV 4:2:0. The block loop keeps its row
+// pointers in locals: stores through unsigned char may alias anything, which would otherwise make
+// the compiler reload the picture records for every pixel.
 template <int kBytes, bool kAlpha>
 class RgbToYuvWalk {
 public:
     RgbToYuvWalk(const PlanarPicture& dst, const PackedRows& src) : dst_(dst), src_(src) {}
 
-    void Run(int width, int height)
+    void BlockRow(int r, int evenWidth) const
     {
-        const int evenWidth = width & ~1;
-        const int evenHeight = height & ~1;
-        for (int r = 0; r < evenHeight; r += 2)
-            BlockRow(r, evenWidth);
-        if (width & 1) {
-            for (int r = 0; r < evenHeight; r += 2)
-                EdgeColumnBlock(r, width - 1);
+        const unsigned char* s0 = src_.Row(r);
+        const unsigned char* s1 = src_.Row(r + 1);
+        unsigned char* y0 = dst_.YRow(r);
+        unsigned char* y1 = dst_.YRow(r + 1);
+        unsigned char* a0 = AlphaRow(r);
+        unsigned char* a1 = AlphaRow(r + 1);
+        unsigned char* u = dst_.URow(r >> 1);
+        unsigned char* v = dst_.VRow(r >> 1);
+        for (int c = 0; c < evenWidth; c += 2) {
+            const LumaChroma p00 = Store(s0, y0, a0, c);
+            const LumaChroma p01 = Store(s0, y0, a0, c + 1);
+            const LumaChroma p10 = Store(s1, y1, a1, c);
+            const LumaChroma p11 = Store(s1, y1, a1, c + 1);
+            u[c >> 1] = ChromaOf4(p00.du, p01.du, p10.du, p11.du);
+            v[c >> 1] = ChromaOf4(p00.dv, p01.dv, p10.dv, p11.dv);
         }
-        if (height & 1) {
-            EdgeRow(height - 1, evenWidth);
-            if (width & 1)
-                Corner(width - 1, height - 1);
-        }
+    }
+
+    void EdgeColumnPair(int r, int c) const
+    {
+        const LumaChroma top = Take(r, c);
+        const LumaChroma bottom = Take(r + 1, c);
+        PutChroma(r, c, ChromaOf2(top.du, bottom.du), ChromaOf2(top.dv, bottom.dv));
+    }
+
+    void EdgeRowPair(int r, int c) const
+    {
+        const LumaChroma left = Take(r, c);
+        const LumaChroma right = Take(r, c + 1);
+        PutChroma(r, c, ChromaOf2(left.du, right.du), ChromaOf2(left.dv, right.dv));
+    }
+
+    void Corner(int r, int c) const
+    {
+        const LumaChroma p = Take(r, c);
+        PutChroma(r, c, ChromaOf1(p.du), ChromaOf1(p.dv));
     }
 
 private:
@@ -51,53 +76,11 @@ private:
 
     LumaChroma Take(int r, int c) const { return Store(src_.Row(r), dst_.YRow(r), AlphaRow(r), c); }
 
-    // The hot loop keeps its row pointers in locals: stores through unsigned char may alias
-    // anything, which would otherwise make the compiler reload the picture records per pixel.
-    void BlockRow(int r, int evenWidth) const
+    // Stores the chroma sample covering pixel (c, r).
+    void PutChroma(int r, int c, unsigned char u, unsigned char v) const
     {
-        const unsigned char* s0 = src_.Row(r);
-        const unsigned char* s1 = src_.Row(r + 1);
-        unsigned char* y0 = dst_.YRow(r);
-        unsigned char* y1 = dst_.YRow(r + 1);
-        unsigned char* a0 = AlphaRow(r);
-        unsigned char* a1 = AlphaRow(r + 1);
-        unsigned char* u = dst_.URow(r >> 1);
-        unsigned char* v = dst_.VRow(r >> 1);
-        for (int c = 0; c < evenWidth; c += 2) {
-            const LumaChroma p00 = Store(s0, y0, a0, c);
-            const LumaChroma p01 = Store(s0, y0, a0, c + 1);
-            const LumaChroma p10 = Store(s1, y1, a1, c);
-            const LumaChroma p11 = Store(s1, y1, a1, c + 1);
-            u[c >> 1] = ChromaOf4(p00.du, p01.du, p10.du, p11.du);
-            v[c >> 1] = ChromaOf4(p00.dv, p01.dv, p10.dv, p11.dv);
-        }
-    }
-
-    void EdgeColumnBlock(int r, int c) const
-    {
-        const LumaChroma top = Take(r, c);
-        const LumaChroma bottom = Take(r + 1, c);
-        dst_.URow(r >> 1)[c >> 1] = ChromaOf2(top.du, bottom.du);
-        dst_.VRow(r >> 1)[c >> 1] = ChromaOf2(top.dv, bottom.dv);
-    }
-
-    void EdgeRow(int r, int evenWidth) const
-    {
-        unsigned char* u = dst_.URow(r >> 1);
-        unsigned char* v = dst_.VRow(r >> 1);
-        for (int c = 0; c < evenWidth; c += 2) {
-            const LumaChroma left = Take(r, c);
-            const LumaChroma right = Take(r, c + 1);
-            u[c >> 1] = ChromaOf2(left.du, right.du);
-            v[c >> 1] = ChromaOf2(left.dv, right.dv);
-        }
-    }
-
-    void Corner(int c, int r) const
-    {
-        const LumaChroma p = Take(r, c);
-        dst_.URow(r >> 1)[c >> 1] = ChromaOf1(p.du);
-        dst_.VRow(r >> 1)[c >> 1] = ChromaOf1(p.dv);
+        dst_.URow(r >> 1)[c >> 1] = u;
+        dst_.VRow(r >> 1)[c >> 1] = v;
     }
 
     const PlanarPicture dst_;
@@ -107,7 +90,7 @@ private:
 template <int kBytes, bool kAlpha>
 void RunRgbToYuv(const PlanarPicture& dst, const PackedRows& src, int width, int height)
 {
-    RgbToYuvWalk<kBytes, kAlpha>(dst, src).Run(width, height);
+    WalkBlocks(RgbToYuvWalk<kBytes, kAlpha>(dst, src), width, height);
 }
 
 // Per-pixel path for one pixel: stores Y and adds U and V to the block's sums.

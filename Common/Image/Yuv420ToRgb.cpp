@@ -1,3 +1,4 @@
+#include "Common/Image/BlockWalk.h"
 #include "Common/Image/ColourArithmetic.h"
 #include "Common/Image/ConvertKernels.h"
 
@@ -6,56 +7,14 @@ namespace avpost::detail {
 namespace {
 
 // Table-path conversion of planar YUV 4:2:0 into packed pixels. Each chroma sample is replicated
-// to its block; its chroma terms are computed once. Whole 2 x 2 blocks first, then the edge
-// column, the edge row and the corner.
+// to its block; its chroma terms are computed once. The block loop keeps its row pointers in
+// locals: stores through unsigned char may alias anything, which would otherwise make the
+// compiler reload the picture records for every pixel.
 template <int kBytes, bool kOpaque>
 class YuvToRgbWalk {
 public:
     YuvToRgbWalk(const PackedRows& dst, const PlanarPicture& src) : dst_(dst), src_(src) {}
 
-    void Run(int width, int height)
-    {
-        const int evenWidth = width & ~1;
-        const int evenHeight = height & ~1;
-        for (int r = 0; r < evenHeight; r += 2)
-            BlockRow(r, evenWidth);
-        if (width & 1) {
-            for (int r = 0; r < evenHeight; r += 2) {
-                const ChromaTerms t = Terms(r, width - 1);
-                Put(r, width - 1, t);
-                Put(r + 1, width - 1, t);
-            }
-        }
-        if (height & 1) {
-            const int r = height - 1;
-            for (int c = 0; c < evenWidth; c += 2) {
-                const ChromaTerms t = Terms(r, c);
-                Put(r, c, t);
-                Put(r, c + 1, t);
-            }
-            if (width & 1)
-                Put(r, width - 1, Terms(r, width - 1));
-        }
-    }
-
-private:
-    // The chroma terms of the sample covering pixel (c, r).
-    ChromaTerms Terms(int r, int c) const
-    {
-        return TableChromaTerms(src_.URow(r >> 1)[c >> 1], src_.VRow(r >> 1)[c >> 1]);
-    }
-
-    static void Store(int y, const ChromaTerms& t, unsigned char* pixel)
-    {
-        TableYuvToBgr(y, t, pixel);
-        if constexpr (kOpaque)
-            pixel[3] = 255;
-    }
-
-    void Put(int r, int c, const ChromaTerms& t) const { Store(src_.YRow(r)[c], t, dst_.Row(r) + c * kBytes); }
-
-    // The hot loop keeps its row pointers in locals: stores through unsigned char may alias
-    // anything, which would otherwise make the compiler reload the picture records per pixel.
     void BlockRow(int r, int evenWidth) const
     {
         const unsigned char* y0 = src_.YRow(r);
@@ -73,6 +32,38 @@ private:
         }
     }
 
+    void EdgeColumnPair(int r, int c) const
+    {
+        const ChromaTerms t = Terms(r, c);
+        Put(r, c, t);
+        Put(r + 1, c, t);
+    }
+
+    void EdgeRowPair(int r, int c) const
+    {
+        const ChromaTerms t = Terms(r, c);
+        Put(r, c, t);
+        Put(r, c + 1, t);
+    }
+
+    void Corner(int r, int c) const { Put(r, c, Terms(r, c)); }
+
+private:
+    // The chroma terms of the sample covering pixel (c, r).
+    ChromaTerms Terms(int r, int c) const
+    {
+        return TableChromaTerms(src_.URow(r >> 1)[c >> 1], src_.VRow(r >> 1)[c >> 1]);
+    }
+
+    static void Store(int y, const ChromaTerms& t, unsigned char* pixel)
+    {
+        TableYuvToBgr(y, t, pixel);
+        if constexpr (kOpaque)
+            pixel[3] = 255;
+    }
+
+    void Put(int r, int c, const ChromaTerms& t) const { Store(src_.YRow(r)[c], t, dst_.Row(r) + c * kBytes); }
+
     const PackedRows dst_;
     const PlanarPicture src_;
 };
@@ -80,7 +71,7 @@ private:
 template <int kBytes, bool kOpaque>
 void RunYuvToRgb(const PackedRows& dst, const PlanarPicture& src, int width, int height)
 {
-    YuvToRgbWalk<kBytes, kOpaque>(dst, src).Run(width, height);
+    WalkBlocks(YuvToRgbWalk<kBytes, kOpaque>(dst, src), width, height);
 }
 
 void PutSimple(int y, int u, int v, unsigned char* bgr)

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <ostream>
 #include <string>
 
 #include "Common/Image/ConvertTestSupport.h"
@@ -75,6 +76,12 @@ const Case kCases[] = {
     {"RgbToPackedNarrowSrc", [] { Rgb24_2_YUY2(b, 32, 0, 0, 9, 1, 1, b, 1, 30, 2, 0); },
      "nPitchSrc / 3 - xSrc >= cxDst"},
 };
+
+// Names the parameter in test listings instead of dumping its bytes.
+void PrintTo(const Case& param, std::ostream* os)
+{
+    *os << param.name;
+}
 
 class FailedPreconditions : public ::testing::TestWithParam<Case> {};
 

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <random>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -51,6 +52,12 @@ const Member kMembers[] = {
     {"Rgb32_2_yuv420A_BottomUp", Fn::AlphaBottomUp, 4, true, true},
     {"Rgb32_2_yuv420A_R", Fn::AlphaR, 4, true, true},
 };
+
+// Names the parameter in test listings instead of dumping its bytes.
+void PrintTo(const Member& param, std::ostream* os)
+{
+    *os << param.name;
+}
 
 void Convert(Fn fn, Yuv420Planes& p, unsigned char* a, Bitmap& rgb, int w, int h)
 {

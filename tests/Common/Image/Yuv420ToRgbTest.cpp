@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <random>
+#include <ostream>
 #include <string>
 
 #include "Common/Image/ConvertTestSupport.h"
@@ -32,6 +33,12 @@ const Member kMembers[] = {
     {"Yuv420_2_Argb", 4, false, 255,
      [](Bitmap& rgb, Yuv420Planes& p, tagBITMAPINFOHEADER* h) { Yuv420_2_Argb(h, rgb.plane.Data(), AVPOST_PLANES); }},
 };
+
+// Names the parameter in test listings instead of dumping its bytes.
+void PrintTo(const Member& param, std::ostream* os)
+{
+    *os << param.name;
+}
 
 class YuvToRgbMembers : public ::testing::TestWithParam<Member> {};
 
