@@ -25,5 +25,6 @@
 #include "image/resize/AlphaMaskResizeKernels.h"
 #include "image/resize/ResizeGeometry.h"
 #include "image/resize/YuvFrameResize.h"
+#include "Common/Image/ImageConvert.h"
 
 #endif
