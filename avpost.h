@@ -10,6 +10,13 @@
 #include "media/StreamInfo.h"
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
+#include "media/AudioExports.h"
 #include "video/VideoEvenProcess.h"
+#include "audio/AudioConverter.h"
+#include "audio/AudioEvenProcess.h"
+#include "audio/AudioProcess.h"
+#include "audio/Volume.h"
+#include "support/AppPath.h"
+#include "support/Log.h"
 
 #endif

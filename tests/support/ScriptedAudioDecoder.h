@@ -17,11 +17,9 @@ public:
         int64_t time = 0;  // startTime and streamTime, 100 ns units
         std::vector<unsigned char> bytes;
         int32_t duration = 0;
-        int32_t bits = 0;  // 0: the stream's bits per sample
     };
 
-    ScriptedAudioDecoder(int rate, int channels, int bits, std::vector<Block> blocks = {})
-        : blocks_(std::move(blocks))
+    ScriptedAudioDecoder(int rate, int channels, int bits)
     {
         std::memset(&info_, 0, sizeof(info_));
         info_.audio.sampleRate = rate;
@@ -56,7 +54,7 @@ public:
 
     void Add(int64_t time, std::vector<unsigned char> bytes, int32_t duration = 0)
     {
-        blocks_.push_back(Block{time, std::move(bytes), duration, 0});
+        blocks_.push_back(Block{time, std::move(bytes), duration});
     }
 
     void Close() override { ++closeCalls; }
@@ -80,7 +78,7 @@ public:
         frame_.type = 3;
         frame_.param1 = info_.audio.sampleRate;
         frame_.param2 = info_.audio.channels;
-        frame_.bitsPerSample = block.bits != 0 ? block.bits : info_.audio.bitsPerSample;
+        frame_.bitsPerSample = info_.audio.bitsPerSample;
         frame_.data = block.bytes.data();
         frame_.dataSize = static_cast<int32_t>(block.bytes.size());
         frame_.bufferSize = frame_.dataSize;
