@@ -10,6 +10,7 @@
 #include "media/StreamInfo.h"
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
+#include "media/AudioExports.h"
 #include "video/VideoEvenProcess.h"
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
@@ -25,5 +26,12 @@
 #include "image/resize/AlphaMaskResizeKernels.h"
 #include "image/resize/ResizeGeometry.h"
 #include "image/resize/YuvFrameResize.h"
+#include "Common/Image/ImageConvert.h"
+#include "audio/AudioConverter.h"
+#include "audio/AudioEvenProcess.h"
+#include "audio/AudioProcess.h"
+#include "audio/Volume.h"
+#include "support/AppPath.h"
+#include "support/Log.h"
 
 #endif
