@@ -11,5 +11,8 @@
 #include "media/Decoder.h"
 #include "media/VideoExports.h"
 #include "video/VideoEvenProcess.h"
+#include "video/SingleLock.h"
+#include "video/ResizeParam.h"
+#include "video/VideoProcess.h"
 
 #endif

@@ -2,27 +2,17 @@
 
 #include <cmath>
 #include <cstring>
-#include <limits>
+
+#include "video/Saturate.h"
 
 namespace {
+
+using avpost::detail::TruncSaturate;
 
 constexpr double kUnitsPerSecond = 10000000.0;
 constexpr double kSmallestRate = 0.001;
 constexpr double kHighestRate = 200.0;
 constexpr double kFallbackRate = 30.0;
-
-// Truncates toward zero; values beyond the target range saturate instead of overflowing.
-template <typename Int>
-Int TruncSaturate(double value)
-{
-    if (std::isnan(value))
-        return 0;
-    if (value >= static_cast<double>(std::numeric_limits<Int>::max()))
-        return std::numeric_limits<Int>::max();
-    if (value <= static_cast<double>(std::numeric_limits<Int>::min()))
-        return std::numeric_limits<Int>::min();
-    return static_cast<Int>(value);
-}
 
 }  // namespace
 
