@@ -14,5 +14,9 @@
 #include "video/SingleLock.h"
 #include "video/ResizeParam.h"
 #include "video/VideoProcess.h"
+#include "image/effects/ImageAdjust.h"
+#include "image/effects/ImageFilter.h"
+#include "image/effects/Deinterlace.h"
+#include "image/effects/WaterMark.h"
 
 #endif
