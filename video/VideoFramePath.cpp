@@ -148,8 +148,8 @@ MEDIA_FRAME* VideoProcess::GetFrame() const
     bool forceResize = !sameSize;
     if (resizeParam != nullptr && sameSize) {
         // Fitting into a fixed shape redraws even a picture of unchanged size.
-        const IMAGE_RESIZE_METHOD method = resizeParam->method;
-        forceResize = static_cast<uint32_t>(method) > static_cast<uint32_t>(RESIZE_KEEP_ASPECT) && method != RESIZE_METHOD_4;
+        const auto method = static_cast<uint32_t>(resizeParam->method);
+        forceResize = method > RESIZE_KEEP_ASPECT && method != RESIZE_METHOD_4;
     } else if (resizeParam == nullptr && cropRect != nullptr) {
         forceResize = false;
     }

@@ -43,7 +43,8 @@ public:
     double GetOffset() const override;
     // The processed picture, owned by the stage and valid until the next GetFrame (and across
     // one output-size change by SetCropRect); the input's own picture while passing through;
-    // null when there is no picture or the input has no stream information.
+    // null when there is no picture or the input has no stream information. When the input has
+    // no picture, a kept last picture (keepLastFrame) is drawn anew in its place, resize included.
     MEDIA_FRAME* GetFrame() const override;
     int Forward(int count) override;
 

@@ -78,7 +78,8 @@ TEST(VideoFramePass, SameSizeRequestCopiesOrRedrawsByMethod)
         MEDIA_FRAME* out = stage.GetFrame();
         ASSERT_EQ(out, stage.outputFrame);
         // Method 1 has a 16:9 band in its geometry, but a picture of unchanged size is copied.
-        const FramePtr expected = redraws ? ResizedByStageGeometry(stage, source.GetFrame()) : CopyOf(source.GetFrame());
+        const MEDIA_FRAME* in = source.GetFrame();
+        const FramePtr expected = redraws ? ResizedByStageGeometry(stage, in) : CopyOf(in);
         EXPECT_TRUE(SamePicture(out, expected.get()));
     }
 }
