@@ -18,5 +18,15 @@
 #include "image/effects/ImageFilter.h"
 #include "image/effects/Deinterlace.h"
 #include "image/effects/WaterMark.h"
+#include "image/resize/ImgParam.h"
+#include "image/resize/ImageResize.h"
+#include "image/resize/DibResizeKernels.h"
+#include "image/resize/LumaResizeKernels.h"
+#include "image/resize/ChromaResizeKernels.h"
+#include "image/resize/AveragingResizeKernel.h"
+#include "image/resize/BicubicResizeKernel.h"
+#include "image/resize/AlphaMaskResizeKernels.h"
+#include "image/resize/ResizeGeometry.h"
+#include "image/resize/YuvFrameResize.h"
 
 #endif
