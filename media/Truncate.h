@@ -21,6 +21,16 @@ Int TruncSaturate(double value)
     return static_cast<Int>(value);
 }
 
+// Narrows a 64-bit intermediate to 32 bits, saturating.
+inline int32_t Saturate32(int64_t value)
+{
+    if (value > std::numeric_limits<int32_t>::max())
+        return std::numeric_limits<int32_t>::max();
+    if (value < std::numeric_limits<int32_t>::min())
+        return std::numeric_limits<int32_t>::min();
+    return static_cast<int32_t>(value);
+}
+
 // The low 32 bits of a value, read as a signed 32-bit integer (two's complement wrap).
 inline int32_t Low32(int64_t value)
 {

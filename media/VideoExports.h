@@ -1,8 +1,10 @@
 #ifndef AVPOST_MEDIA_VIDEOEXPORTS_H
 #define AVPOST_MEDIA_VIDEOEXPORTS_H
 
+#include "../video/VideoProcess.h"
 #include "AvpostApi.h"
 #include "Decoder.h"
+#include "WinTypes.h"
 
 // Flat functions a host uses to create, seek and destroy video stages. Every function
 // accepts a null stage and then does nothing (returning null where it returns a value).
@@ -13,8 +15,28 @@ AVPOST_API VideoDecoder* PEVideoCreate(VideoDecoder* source, double frameRate);
 AVPOST_API void PEVideoDestroy(VideoDecoder* stage);
 
 extern "C" {
+// A VideoProcess over an opened source (see VideoProcess); null for a null source or one
+// without stream information. request may be null.
+AVPOST_API VideoDecoder* PCVideoInit(VideoDecoder* source, const RESIZE_PARAM* request, double frameRate,
+                                     bool keepLastFrame);
+// Destroys any video stage; the source it wraps stays with the host.
+AVPOST_API void PCVideoRelease(VideoDecoder* stage);
 // Seeks any video stage; the time reached is discarded.
 AVPOST_API void PCVideoSeek(VideoDecoder* stage, double seconds, unsigned flags);
+
+// Settings of a stage made by PCVideoInit (another kind of stage must not be passed). None
+// takes the stage's lock except PCSetCropRect; the next picture uses them.
+AVPOST_API void PCSetVideoBrightness(VideoDecoder* stage, int value);
+AVPOST_API void PCSetContrast(VideoDecoder* stage, int value);
+AVPOST_API void PCSetVideoSaturation(VideoDecoder* stage, int value);
+AVPOST_API void PCSetVideoDeintelace(VideoDecoder* stage, DEINTERLACE_STYLE style);
+// Bit 0 mirrors left to right, bit 1 upside down.
+AVPOST_API void PCSetFlipFlag(VideoDecoder* stage, unsigned flags);
+// Bits 0...5: gray, emboss, negative, black-white, white-black, old photo.
+AVPOST_API void PCSetExFilterFlag(VideoDecoder* stage, unsigned flags);
+AVPOST_API void PCSetCropRect(VideoDecoder* stage, const tagRECT* rect);
+// Hides the fixed watermark (nonzero) or shows it again (0) without setting its picture anew.
+AVPOST_API void PCDisableWatermark(VideoDecoder* stage, unsigned disable);
 }
 
 #endif

@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
-# Builds and tests the library three ways: x86-64, 32-bit x86 (-m32), and x86-64 with
-# AddressSanitizer and UndefinedBehaviorSanitizer. Exits non-zero on the first failure.
+# Builds and tests the library four ways: x86-64, 32-bit x86 (-m32), x86-64 with
+# AddressSanitizer and UndefinedBehaviorSanitizer, and the tests labelled "threads" under
+# ThreadSanitizer. Exits non-zero on the first failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -9,12 +10,14 @@ scripts/install-deps.sh
 jobs=$(nproc)
 build_root=${AVPOST_BUILD_ROOT:-build}
 
+# variant <name> <cmake arguments>...; build_target and test_label narrow what is built and run.
 variant() {
   local name=$1; shift
   echo "== ${name} =="
   cmake -S . -B "${build_root}/${name}" -G Ninja "$@" >/dev/null
-  cmake --build "${build_root}/${name}" -j "${jobs}"
-  ctest --test-dir "${build_root}/${name}" -j "${jobs}" --output-on-failure --no-tests=error
+  cmake --build "${build_root}/${name}" -j "${jobs}" ${build_target:+--target "${build_target}"}
+  ctest --test-dir "${build_root}/${name}" -j "${jobs}" --output-on-failure --no-tests=error \
+    ${test_label:+-L "${test_label}"}
 }
 
 variant x86-64 -DCMAKE_BUILD_TYPE=RelWithDebInfo
@@ -24,4 +27,9 @@ sanitizers="-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-fra
 variant sanitize -DCMAKE_BUILD_TYPE=Debug -DAVPOST_BUILD_BENCHMARKS=OFF \
   -DCMAKE_CXX_FLAGS="${sanitizers}" -DCMAKE_C_FLAGS="${sanitizers}" \
   -DCMAKE_EXE_LINKER_FLAGS="${sanitizers}" -DCMAKE_SHARED_LINKER_FLAGS="${sanitizers}"
+tsan="-fsanitize=thread -fno-omit-frame-pointer"
+build_target=avpost_thread_tests test_label=threads \
+  variant tsan -DCMAKE_BUILD_TYPE=Debug -DAVPOST_BUILD_BENCHMARKS=OFF \
+  -DCMAKE_CXX_FLAGS="${tsan}" -DCMAKE_C_FLAGS="${tsan}" \
+  -DCMAKE_EXE_LINKER_FLAGS="${tsan}" -DCMAKE_SHARED_LINKER_FLAGS="${tsan}"
 echo "All builds passed."

@@ -1,6 +1,9 @@
 #include "image/resize/ResizeGeometry.h"
 
-#include <limits>
+
+#include "media/Truncate.h"
+
+using avpost::detail::TruncSaturate;
 
 namespace {
 
@@ -36,21 +39,12 @@ void CentreSpan(int32_t& low, int32_t& high, int64_t span, int64_t wanted)
 
 int32_t Span(int32_t low, int32_t high) { return static_cast<int32_t>(static_cast<int64_t>(high) - low); }
 
-int32_t TruncateToInt32(double value)
-{
-    if (!(value > std::numeric_limits<int32_t>::min()))
-        return std::numeric_limits<int32_t>::min();
-    if (!(value < std::numeric_limits<int32_t>::max()))
-        return std::numeric_limits<int32_t>::max();
-    return static_cast<int32_t>(value);
-}
-
 // The output's height corrected by the source's pixel aspect, for cutting the source to fill it.
 int32_t FillHeight(int aspectX, int aspectY, int srcWidth, int srcHeight, int dstWidth, int dstHeight)
 {
     if (aspectX == 0 || aspectY == 0 || srcWidth == 0 || dstWidth == 0)
         return dstHeight;
-    return TruncateToInt32(static_cast<double>(dstHeight) * dstWidth / dstWidth * aspectX / aspectY * srcHeight /
+    return TruncSaturate<int32_t>(static_cast<double>(dstHeight) * dstWidth / dstWidth * aspectX / aspectY * srcHeight /
                                srcWidth +
                            0.5);
 }
@@ -60,8 +54,8 @@ tagSIZE DisplaySize(int32_t w, int32_t h, int aspectX, int aspectY, int srcWidth
 {
     if (aspectX == 0 || aspectY == 0 || srcWidth == 0 || srcHeight == 0)
         return {w, h};
-    return {TruncateToInt32(static_cast<double>(w) / srcWidth * aspectX * kAspectScale + 0.5),
-            TruncateToInt32(static_cast<double>(h) / srcHeight * aspectY * kAspectScale + 0.5)};
+    return {TruncSaturate<int32_t>(static_cast<double>(w) / srcWidth * aspectX * kAspectScale + 0.5),
+            TruncSaturate<int32_t>(static_cast<double>(h) / srcHeight * aspectY * kAspectScale + 0.5)};
 }
 
 void DescribePlane(IMG_PARAM& image, int32_t width, int32_t height, const tagRECT& rect)

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <cstring>
+#include <random>
 #include <vector>
 
 #include "media/Decoder.h"
@@ -35,7 +36,7 @@ public:
 
     void Close() override { ++closeCalls; }
     int Open(const wchar_t*, const DecParam*, int*) override { return 1; }
-    int SetExDecodeParam(unsigned, unsigned, unsigned) override { return 0; }
+    int SetExDecodeParam(unsigned, unsigned, unsigned) override { return exDecodeResult; }
     const STREAM_INFO* GetStreamInfo() const override { return &info_; }
     double Seek(double seconds, unsigned flags) override
     {
@@ -67,6 +68,22 @@ public:
         return 1;
     }
 
+    // Fills the picture with fixed-seed noise in studio range; the first luma byte keeps the index.
+    void Paint(unsigned seed)
+    {
+        std::mt19937 random(seed);
+        const int lumaSize = picture_->width * picture_->height;
+        const int chromaSize = ((picture_->width + 1) / 2) * ((picture_->height + 1) / 2);
+        const unsigned char index = picture_->plane[0][0];
+        for (int i = 0; i < lumaSize; ++i)
+            picture_->plane[0][i] = static_cast<unsigned char>(16 + random() % 220);
+        for (int i = 0; i < chromaSize; ++i) {
+            picture_->plane[1][i] = static_cast<unsigned char>(16 + random() % 225);
+            picture_->plane[2][i] = static_cast<unsigned char>(16 + random() % 225);
+        }
+        picture_->plane[0][0] = index;
+    }
+
     // The index of the picture a frame shows (its first luma byte).
     static int IndexOf(const MEDIA_FRAME* frame) { return frame->plane[0][0]; }
 
@@ -78,6 +95,7 @@ public:
     int forwardCalls = 0;
     int closeCalls = 0;
     bool pictureGoneAtEnd = false;
+    int exDecodeResult = 0;
 
 private:
     void Show(size_t i)

@@ -1,0 +1,114 @@
+#ifndef AVPOST_VIDEO_VIDEOPROCESS_H
+#define AVPOST_VIDEO_VIDEOPROCESS_H
+
+#include <pthread.h>
+
+#include <cstdint>
+
+#include "../image/effects/Deinterlace.h"
+#include "../image/resize/ImgParam.h"
+#include "../media/AvpostApi.h"
+#include "../media/Decoder.h"
+#include "../media/WinTypes.h"
+#include "ResizeParam.h"
+
+// Turns each picture of a video source into the picture a consumer asked for: deinterlaced,
+// cropped and resized into the requested size under a fit policy (black bars elsewhere),
+// adjusted, filtered, mirrored and watermarked. With a positive frame rate the stage puts a
+// VideoEvenProcess of its own between itself and the source. While nothing is to be done it
+// hands the source's pictures through without copying, until it has made a picture of its own.
+//
+// The source is not owned: it is never opened, closed by the destructor, or destroyed here.
+//
+// Threads: GetFrame and SetCropRect hold the stage's mutex for their whole run. The plain
+// settings (brightness, contrast, saturation, filter, flip, deinterlace, watermark enable,
+// level and alignment) are single 32-bit words written and read without the lock, each
+// access atomic, so a change may take effect part-way through a picture.
+class AVPOST_API VideoProcess : public VideoDecoder {
+public:
+    // request may be null: then the output keeps the source's format. A frameRate between
+    // -0.001 and 0.001 takes the source's rate; a positive rate inserts the even stage.
+    VideoProcess(VideoDecoder* source, const RESIZE_PARAM* request, double frameRate, bool keepLastFrame);
+    ~VideoProcess() override;
+    VideoProcess(const VideoProcess&) = delete;
+    VideoProcess& operator=(const VideoProcess&) = delete;
+
+    // Closes the input (the host's source only when no even stage sits between) and drops
+    // the kept last picture.
+    void Close() override;
+    int Open(const wchar_t* path, const DecParam* param, int* result) override;
+    int SetExDecodeParam(unsigned a, unsigned b, unsigned c) override;
+    const STREAM_INFO* GetStreamInfo() const override;
+    double Seek(double seconds, unsigned flags) override;
+    double GetOffset() const override;
+    // The processed picture, owned by the stage and valid until the next GetFrame (and across
+    // one output-size change by SetCropRect); the input's own picture while passing through;
+    // null when there is no picture or the input has no stream information. When the input has
+    // no picture, a kept last picture (keepLastFrame) is drawn anew in its place, resize included.
+    MEDIA_FRAME* GetFrame() const override;
+    int Forward(int count) override;
+
+    void SetExFilterFlag(unsigned flags);
+    void SetFlipFlag(unsigned flags);
+    void SetDeintelace(DEINTERLACE_STYLE style);
+    // 0 shows the fixed watermark again, anything else hides it; the image is kept.
+    void DisableWatermark(unsigned disable);
+
+    // Replaces outputFrame by a new black picture of the given size and returns it.
+    MEDIA_FRAME* PrepareMemImage(int width, int height) const;
+    // Resizes the current picture into outputFrame on a black background.
+    void MakeResizeImage() const;
+    // The same while a crop is set, drawing over what outputFrame already holds.
+    void MakeCropImageEx() const;
+    // Copies the crop rectangle of the current picture into outputFrame, unscaled.
+    void MakeCropImage() const;
+    // Sets (source pixels) or clears the crop and recomputes the output format and the resize
+    // geometry. A rectangle that clamps to the whole picture (given from (0, 0)), or to no
+    // rows or columns, or whose edges are reversed, clears the crop. Null does nothing.
+    void SetCropRect(const tagRECT* rect);
+
+    VideoDecoder* source;
+    VideoDecoder* input;                    // source, or an owned VideoEvenProcess over it
+    STREAM_INFO::VIDEO* outputFormat;       // owned
+    const STREAM_INFO::VIDEO* sourceFormat; // inside the source's record
+    STREAM_INFO* streamInfo;                // owned; video equals *outputFormat
+    int32_t brightness;
+    int32_t contrast;
+    int32_t saturation;
+    MEDIA_FRAME* watermarkFrame;            // owned
+    int32_t watermarkEnabled;
+    uint32_t filterFlags;
+    uint32_t flipFlags;
+    tagRECT* watermarkRect;                 // owned; output pixels, moved by the crop
+    int32_t watermarkLevel;
+    int32_t watermarkAlign;
+    MEDIA_FRAME* userWatermarkFrame;        // owned
+    mutable MEDIA_FRAME* userWatermarkCache; // owned; userWatermarkFrame at its placed size
+    int32_t userWatermarkLevel;
+    tagFRECT* userWatermarkRect;            // owned; fractions of the output size
+    mutable MEDIA_FRAME* outputFrame;       // owned
+    mutable MEDIA_FRAME* deinterlaceFrame;  // owned
+    MEDIA_FRAME* retiredFrame;              // owned; the output before the last size change
+    tagRECT* cropRect;                      // owned; source pixels; null = no crop
+    RESIZE_PARAM* resizeParam;              // owned; null when no request was given
+    mutable IMG_PARAM srcParam;
+    mutable IMG_PARAM dstParam;
+    mutable pthread_mutex_t mutex;
+    DEINTERLACE_STYLE deinterlaceStyle;
+    mutable MEDIA_FRAME* lastFrame;         // owned; copy of the input's last picture
+    bool keepLastFrame;
+
+private:
+    bool NothingToDo() const;
+    MEDIA_FRAME* InputPicture() const;
+    MEDIA_FRAME* PictureForResize() const;
+    void KeepCopy(const MEDIA_FRAME& picture) const;
+    void DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs) const;
+    void DrawResized(MEDIA_FRAME* picture) const;
+    void ApplyEffects() const;
+    void BlendUserWatermark() const;
+    void BlendWatermark() const;
+    void RetireOutputFrame();
+};
+
+#endif
