@@ -26,5 +26,6 @@
 #include "image/resize/ResizeGeometry.h"
 #include "image/resize/YuvFrameResize.h"
 #include "Common/Image/ImageConvert.h"
+#include "support/TextEncoding.h"
 
 #endif
