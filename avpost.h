@@ -26,6 +26,10 @@
 #include "image/resize/ResizeGeometry.h"
 #include "image/resize/YuvFrameResize.h"
 #include "Common/Image/ImageConvert.h"
+#include "image/output/DibImage.h"
+#include "image/output/JpegEncoder.h"
+#include "image/output/JpegCoreProperties.h"
+#include "image/output/IjlObj.h"
 #include "support/TextEncoding.h"
 
 #endif
