@@ -24,7 +24,7 @@ Bytes Headers24(uint32_t fileSize, int32_t width, int32_t height, uint32_t image
     };
     Bytes h = {'B', 'M'};
     for (const Bytes& part : {le(fileSize, 4), le(0, 4), le(54, 4), le(40, 4), le(width, 4), le(height, 4), le(1, 2),
-                              le(24, 2), le(0, 4), le(imageSize, 4), le(0, 16)})
+                              le(24, 2), le(0, 4), le(imageSize, 4), Bytes(16, 0)})
         h.insert(h.end(), part.begin(), part.end());
     return h;
 }
