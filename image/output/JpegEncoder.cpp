@@ -443,13 +443,23 @@ void DctPass(float* d, int step)
     d[7 * step] = z11 - z4;
 }
 
+// Single-precision Arai-Agui-Nakajima DCT in place, rows first, then columns. The outputs
+// carry the AAN scale factors, which the quantisation divisors remove.
+void ForwardDctAan(float block[64])
+{
+    for (int row = 0; row < 8; ++row)
+        DctPass(block + 8 * row, 1);
+    for (int col = 0; col < 8; ++col)
+        DctPass(block + col, 8);
+}
+
 void Encoder::ProcessDU(const signed char* block, const float* divisors, int& predictor, const bitstring* dcTable,
                         const bitstring* acTable)
 {
     float coefficients[64];
     for (int i = 0; i < 64; ++i)
         coefficients[i] = block[i];
-    avpost::detail::ForwardDctAan(coefficients);
+    ForwardDctAan(coefficients);
     for (int i = 0; i < 64; ++i)
         DU_DCT[i] = avpost::detail::QuantizeCoefficient(coefficients[i], divisors[i]);
     for (int i = 0; i < 64; ++i)
@@ -641,14 +651,6 @@ int Encoder::Convert(const char* bmpPath, const char* jpegPath)
 }  // namespace
 
 namespace avpost::detail {
-
-void ForwardDctAan(float block[64])
-{
-    for (int row = 0; row < 8; ++row)
-        DctPass(block + 8 * row, 1);
-    for (int col = 0; col < 8; ++col)
-        DctPass(block + col, 8);
-}
 
 short QuantizeCoefficient(float coefficient, float divisor)
 {

@@ -61,45 +61,41 @@ unsigned char* DibRow(const JPEG_CORE_PROPERTIES& p, uint32_t line)
 
 bool HasBuffer(const JPEG_CORE_PROPERTIES& p) { return p.JPGBytes != nullptr && p.JPGSizeBytes > 0; }
 
+// Runs work on a decoder that has read the header of the buffer; work gives the result code.
+template <typename Work>
+int WithDecoder(const JPEG_CORE_PROPERTIES& p, Work work)
+{
+    jpeg_decompress_struct codec;
+    ErrorTrap trap;
+    codec.err = InstallTrap(trap);
+    if (setjmp(trap.jump)) {
+        jpeg_destroy_decompress(&codec);
+        return kCorruptData;
+    }
+    jpeg_create_decompress(&codec);
+    jpeg_mem_src(&codec, p.JPGBytes, p.JPGSizeBytes);
+    jpeg_read_header(&codec, TRUE);
+    const int result = work(codec);
+    jpeg_destroy_decompress(&codec);
+    return result;
+}
+
 int ReadParameters(JPEG_CORE_PROPERTIES& p)
 {
     if (!HasBuffer(p))
         return kInvalidArgument;
-    jpeg_decompress_struct codec;
-    ErrorTrap trap;
-    codec.err = InstallTrap(trap);
-    if (setjmp(trap.jump)) {
-        jpeg_destroy_decompress(&codec);
-        return kCorruptData;
-    }
-    jpeg_create_decompress(&codec);
-    jpeg_mem_src(&codec, p.JPGBytes, p.JPGSizeBytes);
-    jpeg_read_header(&codec, TRUE);
-    p.JPGWidth = codec.image_width;
-    p.JPGHeight = static_cast<int32_t>(codec.image_height);
-    p.JPGChannels = static_cast<uint32_t>(codec.num_components);
-    jpeg_destroy_decompress(&codec);
-    return kIjlOk;
+    return WithDecoder(p, [&p](jpeg_decompress_struct& codec) {
+        p.JPGWidth = codec.image_width;
+        p.JPGHeight = static_cast<int32_t>(codec.image_height);
+        p.JPGChannels = static_cast<uint32_t>(codec.num_components);
+        return kIjlOk;
+    });
 }
 
-int ReadImage(JPEG_CORE_PROPERTIES& p)
+int DecodeRows(const JPEG_CORE_PROPERTIES& p, jpeg_decompress_struct& codec)
 {
-    if (!HasBuffer(p) || p.DIBBytes == nullptr || p.DIBChannels != kChannels)
+    if (codec.image_width != p.DIBWidth || codec.image_height != PictureHeight(p.DIBHeight))
         return kInvalidArgument;
-    jpeg_decompress_struct codec;
-    ErrorTrap trap;
-    codec.err = InstallTrap(trap);
-    if (setjmp(trap.jump)) {
-        jpeg_destroy_decompress(&codec);
-        return kCorruptData;
-    }
-    jpeg_create_decompress(&codec);
-    jpeg_mem_src(&codec, p.JPGBytes, p.JPGSizeBytes);
-    jpeg_read_header(&codec, TRUE);
-    if (codec.image_width != p.DIBWidth || codec.image_height != PictureHeight(p.DIBHeight)) {
-        jpeg_destroy_decompress(&codec);
-        return kInvalidArgument;
-    }
     codec.out_color_space = JCS_EXT_BGR;
     jpeg_start_decompress(&codec);
     while (codec.output_scanline < codec.output_height) {
@@ -107,8 +103,14 @@ int ReadImage(JPEG_CORE_PROPERTIES& p)
         jpeg_read_scanlines(&codec, &row, 1);
     }
     jpeg_finish_decompress(&codec);
-    jpeg_destroy_decompress(&codec);
     return kIjlOk;
+}
+
+int ReadImage(const JPEG_CORE_PROPERTIES& p)
+{
+    if (!HasBuffer(p) || p.DIBBytes == nullptr || p.DIBChannels != kChannels)
+        return kInvalidArgument;
+    return WithDecoder(p, [&p](jpeg_decompress_struct& codec) { return DecodeRows(p, codec); });
 }
 
 int Compress(const JPEG_CORE_PROPERTIES& p, std::FILE* file)

@@ -29,34 +29,29 @@ Bytes Headers24(uint32_t fileSize, int32_t width, int32_t height, uint32_t image
     return h;
 }
 
-TEST(DibImageFile, TwoByTwoPadsEachRowToEightBytes)
+// The 2 x 2 rows are 6 bytes padded to 8 (bottom row first), the 1 x 1 row 3 padded to 4.
+TEST(DibImageFile, TwentyFourBitFilesPadRowsToWholeWords)
 {
-    DibImage image;
-    ASSERT_EQ(image.Create(2, 2, 24), 1);
-    EXPECT_EQ(image.stride, 8);
-    EXPECT_EQ(image.info->bmiHeader.biSizeImage, 16u);
-    for (int i = 0; i < 6; ++i) {
-        image.bits[i] = static_cast<unsigned char>(i + 1);           // bottom row
-        image.bits[8 + i] = static_cast<unsigned char>(0xA0 + i);    // top row
+    const struct {
+        int width, height;
+        uint32_t fileSize;
+        Bytes pixels;
+    } cases[] = {
+        {2, 2, 70, {1, 2, 3, 4, 5, 6, 0, 0, 0xA0, 0xA1, 0xA2, 0xA3, 0xA4, 0xA5, 0, 0}},
+        {1, 1, 58, {1, 2, 3, 0}},
+    };
+    ScratchDir dir;
+    for (const auto& c : cases) {
+        DibImage image;
+        ASSERT_EQ(image.Create(c.width, c.height, 24), 1);
+        for (int y = 0; y < c.height; ++y)
+            for (int i = 0; i < 3 * c.width; ++i)
+                image.bits[y * image.stride + i] = c.pixels[y * image.stride + i];
+        ASSERT_EQ(image.Save(dir.File("out.bmp").c_str()), 1);
+        Bytes expected = Headers24(c.fileSize, c.width, c.height, static_cast<uint32_t>(c.pixels.size()));
+        expected.insert(expected.end(), c.pixels.begin(), c.pixels.end());
+        EXPECT_EQ(ReadFile(dir.File("out.bmp")), expected) << c.width;
     }
-    ScratchDir dir;
-    ASSERT_EQ(image.Save(dir.File("2x2.bmp").c_str()), 1);
-
-    Bytes expected = Headers24(70, 2, 2, 16);
-    expected.insert(expected.end(), {1, 2, 3, 4, 5, 6, 0, 0, 0xA0, 0xA1, 0xA2, 0xA3, 0xA4, 0xA5, 0, 0});
-    EXPECT_EQ(ReadFile(dir.File("2x2.bmp")), expected);
-}
-
-TEST(DibImageFile, OnePixelHasAStrideOfFour)
-{
-    DibImage image;
-    ASSERT_EQ(image.Create(1, 1, 24), 1);
-    image.bits[0] = 7;
-    ScratchDir dir;
-    ASSERT_EQ(image.Save(dir.File("1x1.bmp").c_str()), 1);
-    Bytes expected = Headers24(58, 1, 1, 4);
-    expected.insert(expected.end(), {7, 0, 0, 0});
-    EXPECT_EQ(ReadFile(dir.File("1x1.bmp")), expected);
 }
 
 TEST(DibImageFile, EightBitImageWritesItsWholeColourTable)

@@ -3,7 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <filesystem>
 
 #include "OutputTestFiles.h"
@@ -15,17 +14,6 @@ namespace {
 using avpost_test::Bytes;
 using avpost_test::Picture;
 using avpost_test::ScratchDir;
-
-// The rows of a 24-bit image, top row first.
-Picture PictureOf(const DibImage& image)
-{
-    const int width = image.info->bmiHeader.biWidth, height = image.info->bmiHeader.biHeight;
-    Picture p{width, height, Bytes(static_cast<size_t>(width) * height * 3)};
-    for (int y = 0; y < height; ++y)
-        std::memcpy(p.Pixel(0, y), image.bits + static_cast<size_t>(height - 1 - y) * image.stride,
-                    static_cast<size_t>(width) * 3);
-    return p;
-}
 
 class StandIn : public ::testing::Test {
 protected:
@@ -40,11 +28,8 @@ TEST_F(StandIn, RoundTripKeepsSizeRowOrderAndColours)
 {
     for (int width : {100, 101}) {
         const Picture source = avpost_test::GradientPicture(width, 75);
-        avpost_test::SaveBmp(source, dir.File("source.bmp"));
         DibImage image;
-        ASSERT_EQ(image.Create(width, 75, 24), 1);
-        const Bytes bmp = avpost_test::ReadFile(dir.File("source.bmp"));
-        std::memcpy(image.bits, bmp.data() + 54, image.info->bmiHeader.biSizeImage);
+        avpost_test::FillDib(source, image);
         ASSERT_EQ(ijl.Save(image, dir.File("round.jpg").c_str(), 10), 1);
 
         Bytes jpeg = avpost_test::ReadFile(dir.File("round.jpg"));
@@ -52,7 +37,7 @@ TEST_F(StandIn, RoundTripKeepsSizeRowOrderAndColours)
         ASSERT_EQ(ijl.ProcessBuffer(jpeg.data(), jpeg.size(), decoded), 1);
         EXPECT_EQ(decoded.info->bmiHeader.biBitCount, 24);
         EXPECT_EQ(decoded.stride, width == 100 ? 300 : 304);
-        EXPECT_GT(avpost_test::Psnr(PictureOf(decoded), source), 34.0) << width;
+        EXPECT_GT(avpost_test::Psnr(avpost_test::PictureOf(decoded), source), 34.0) << width;
     }
 }
 
@@ -64,7 +49,7 @@ TEST_F(StandIn, DecodesWhatTheBaselineEncoderWrites)
     Bytes jpeg = avpost_test::ReadFile(dir.File("out.jpg"));
     DibImage decoded;
     ASSERT_EQ(ijl.ProcessBuffer(jpeg.data(), jpeg.size(), decoded), 1);
-    EXPECT_GT(avpost_test::Psnr(PictureOf(decoded), source), 36.0);
+    EXPECT_GT(avpost_test::Psnr(avpost_test::PictureOf(decoded), source), 36.0);
 }
 
 TEST_F(StandIn, FailuresReturnZeroAndLeaveNoFile)

@@ -2,7 +2,6 @@
 
 #include <gtest/gtest.h>
 
-#include <cmath>
 #include <cstdio>
 #include <filesystem>
 #include <string>
@@ -186,22 +185,18 @@ TEST(JpegConcurrency, ConversionsOnTwoThreadsDoNotMix)
     second.join();
 }
 
-TEST(JpegSteps, StepFunctionsOutsideAConversionWriteNothing)
+TEST(JpegSteps, StepsOutsideAConversionLeaveTheNextOneUnaffected)
 {
     writebits({3, 0x5});
     main_encoder();
-    init_all();
-    main_encoder();  // tables but no picture
     ScratchDir dir;
     avpost_test::SaveBmp(avpost_test::FlatPicture(3, 2, 1, 2, 3), dir.File("in.bmp"));
     unsigned short width = 0, height = 0;
     EXPECT_EQ(load_bitmap(dir.File("in.bmp").c_str(), &width, &height), 1);
-    EXPECT_EQ(width, 3);
-    EXPECT_EQ(height, 2);
-    EXPECT_EQ(load_bitmap(nullptr, &width, &height), 0);
-    // A later conversion is unaffected by the stray bits.
-    const Bytes jpeg = Encode(avpost_test::FlatPicture(1, 1, 133, 133, 133), dir);
-    EXPECT_EQ(Scan(jpeg), (Bytes{0x96, 0x80, 0x3F}));
+    EXPECT_EQ(width * 100 + height, 302);
+    init_all();
+    main_encoder();
+    EXPECT_EQ(Scan(Encode(avpost_test::FlatPicture(1, 1, 133, 133, 133), dir)), (Bytes{0x96, 0x80, 0x3F}));
 }
 
 TEST(FetchMatrix, CopiesABlockAndFillsOutsideThePlane)
@@ -223,29 +218,6 @@ TEST(FetchMatrix, CopiesABlockAndFillsOutsideThePlane)
     EXPECT_EQ(block[62], static_cast<signed char>(plane[0]));
     EXPECT_EQ(block[61], 1);
     EXPECT_EQ(block[55], 1);
-}
-
-// The AAN outputs are the orthonormal 2-D DCT scaled by 8 x a[u] x a[v].
-TEST(JpegKernels, AanDctMatchesTheTextbookTransformUpToItsScale)
-{
-    const double pi = std::acos(-1.0);
-    auto scale = [&](int k) { return k == 0 ? 1.0 : std::cos(k * pi / 16) * std::sqrt(2.0); };
-    float block[64];
-    for (int i = 0; i < 64; ++i)
-        block[i] = static_cast<float>((i * 37 + (i / 8) * 11) % 256 - 128);
-    float aan[64];
-    std::copy(block, block + 64, aan);
-    avpost::detail::ForwardDctAan(aan);
-    for (int u = 0; u < 8; ++u)
-        for (int v = 0; v < 8; ++v) {
-            double sum = 0;
-            for (int y = 0; y < 8; ++y)
-                for (int x = 0; x < 8; ++x)
-                    sum += block[8 * y + x] * std::cos((2 * y + 1) * u * pi / 16) * std::cos((2 * x + 1) * v * pi / 16);
-            const double cu = u == 0 ? std::sqrt(0.5) : 1.0, cv = v == 0 ? std::sqrt(0.5) : 1.0;
-            const double expected = 8 * scale(u) * scale(v) * cu * cv * sum / 4;
-            EXPECT_NEAR(aan[8 * u + v], expected, 0.05) << u << "," << v;
-        }
 }
 
 TEST(JpegKernels, QuantisationRoundsHalvesUpward)

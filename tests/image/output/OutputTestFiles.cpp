@@ -70,13 +70,28 @@ Picture NoisePicture(int width, int height, uint32_t seed)
     return p;
 }
 
-void SaveBmp(const Picture& picture, const std::string& path)
+void FillDib(const Picture& picture, DibImage& image)
 {
-    DibImage image;
     ASSERT_EQ(image.Create(picture.width, picture.height, 24), 1);
     for (int y = 0; y < picture.height; ++y)
         std::memcpy(image.bits + static_cast<size_t>(picture.height - 1 - y) * image.stride,
                     &picture.bgr[static_cast<size_t>(y) * picture.width * 3], static_cast<size_t>(picture.width) * 3);
+}
+
+Picture PictureOf(const DibImage& image)
+{
+    const int width = image.info->bmiHeader.biWidth, height = image.info->bmiHeader.biHeight;
+    Picture p{width, height, Bytes(static_cast<size_t>(width) * height * 3)};
+    for (int y = 0; y < height; ++y)
+        std::memcpy(p.Pixel(0, y), image.bits + static_cast<size_t>(height - 1 - y) * image.stride,
+                    static_cast<size_t>(width) * 3);
+    return p;
+}
+
+void SaveBmp(const Picture& picture, const std::string& path)
+{
+    DibImage image;
+    FillDib(picture, image);
     ASSERT_EQ(image.Save(path.c_str()), 1);
 }
 

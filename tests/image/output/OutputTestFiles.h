@@ -8,6 +8,8 @@
 #include <string>
 #include <vector>
 
+class DibImage;
+
 namespace avpost_test {
 
 using Bytes = std::vector<unsigned char>;
@@ -39,7 +41,10 @@ Picture FlatPicture(int width, int height, unsigned char blue, unsigned char gre
 Picture GradientPicture(int width, int height);
 Picture NoisePicture(int width, int height, uint32_t seed);
 
-// Saves the picture as a bottom-up 24-bit BMP through DibImage.
+// A 24-bit DibImage holding the picture (bottom-up rows), and the way back.
+void FillDib(const Picture& picture, DibImage& image);
+Picture PictureOf(const DibImage& image);
+// Saves the picture as a 24-bit BMP through DibImage.
 void SaveBmp(const Picture& picture, const std::string& path);
 
 // Peak signal-to-noise ratio in dB over all bytes of two pictures of the same size.
