@@ -62,7 +62,8 @@ std::vector<std::string> IjlLibraryCandidates()
 
 bool LoadIjlLibrary(CIjlObj& obj, const char* file)
 {
-    void* handle = dlopen(file, RTLD_NOW | RTLD_LOCAL);
+    // A null name would open the program itself.
+    void* handle = file != nullptr ? dlopen(file, RTLD_NOW | RTLD_LOCAL) : nullptr;
     if (handle == nullptr)
         return false;
     CIjlObj loaded;

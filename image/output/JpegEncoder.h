@@ -17,10 +17,10 @@ struct bitstring {
 };
 
 // Converts the BMP file into a JPEG file. Returns 0 when the BMP cannot be used (cannot be
-// opened, shorter than its header and pixel rows, not "BM", not 24 bits per pixel) or either
-// name is null or longer than 511 bytes; nothing is written then. When the JPEG file cannot be
-// created or memory is missing, returns EOF and writes nothing. Otherwise returns the result
-// of closing the JPEG file, 0 on a normal close.
+// opened, shorter than its header and pixel rows, not "BM", not 24 bits per pixel, no memory
+// for the picture) or either name is null or longer than 511 bytes; nothing is written then.
+// When the JPEG file cannot be created or memory for the tables is missing, returns EOF and
+// writes nothing. Otherwise returns the result of closing the JPEG file, 0 on a normal close.
 AVPOST_API int BMP2JPEG(const char* bmpPath, const char* jpegPath);
 
 // The steps of a conversion, for hosts that drive them one by one. They share the encoder's

@@ -37,6 +37,7 @@ TEST(IjlLookup, AnUnloadedWrapperFailsEveryOperation)
 {
     CIjlObj ijl;
     EXPECT_FALSE(avpost::detail::LoadIjlLibrary(ijl, "/nonexistent/IJL15.DLL"));
+    EXPECT_FALSE(avpost::detail::LoadIjlLibrary(ijl, nullptr));
     EXPECT_EQ(ijl.handle, nullptr);
     unsigned char data[4] = {0xFF, 0xD8, 0xFF, 0xD9};
     DibImage image;
