@@ -36,5 +36,10 @@
 #include "audio/Volume.h"
 #include "support/AppPath.h"
 #include "support/Log.h"
+#include "image/output/DibImage.h"
+#include "image/output/JpegEncoder.h"
+#include "image/output/JpegCoreProperties.h"
+#include "image/output/IjlObj.h"
+#include "support/TextEncoding.h"
 
 #endif
