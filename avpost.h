@@ -19,6 +19,7 @@
 #include "image/effects/ImageFilter.h"
 #include "image/effects/Deinterlace.h"
 #include "image/effects/WaterMark.h"
+#include "image/effects/WatermarkResize.h"
 #include "image/resize/ImgParam.h"
 #include "image/resize/ImageResize.h"
 #include "image/resize/DibResizeKernels.h"
@@ -36,5 +37,11 @@
 #include "audio/Volume.h"
 #include "support/AppPath.h"
 #include "support/Log.h"
+#include "image/output/DibImage.h"
+#include "image/output/JpegEncoder.h"
+#include "image/output/SaveYUVImage.h"
+#include "image/output/JpegCoreProperties.h"
+#include "image/output/IjlObj.h"
+#include "support/TextEncoding.h"
 
 #endif

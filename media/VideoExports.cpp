@@ -10,10 +10,11 @@ namespace {
 
 using avpost::detail::StoreSetting;
 
-// The handle of a stage made by PCVideoInit; the kind of stage is the caller's promise.
+// The stage behind a handle from PCVideoInit; null for null and for any other kind of stage,
+// so a wrong handle is ignored instead of being written through.
 VideoProcess* AsVideoProcess(VideoDecoder* stage)
 {
-    return static_cast<VideoProcess*>(stage);
+    return dynamic_cast<VideoProcess*>(stage);
 }
 
 }  // namespace
@@ -53,48 +54,85 @@ void PCVideoSeek(VideoDecoder* stage, double seconds, unsigned flags)
 
 void PCSetVideoBrightness(VideoDecoder* stage, int value)
 {
-    if (stage != nullptr)
-        StoreSetting(AsVideoProcess(stage)->brightness, int32_t{value});
+    if (VideoProcess* process = AsVideoProcess(stage))
+        StoreSetting(process->brightness, int32_t{value});
 }
 
 void PCSetContrast(VideoDecoder* stage, int value)
 {
-    if (stage != nullptr)
-        StoreSetting(AsVideoProcess(stage)->contrast, int32_t{value});
+    if (VideoProcess* process = AsVideoProcess(stage))
+        StoreSetting(process->contrast, int32_t{value});
 }
 
 void PCSetVideoSaturation(VideoDecoder* stage, int value)
 {
-    if (stage != nullptr)
-        StoreSetting(AsVideoProcess(stage)->saturation, int32_t{value});
+    if (VideoProcess* process = AsVideoProcess(stage))
+        StoreSetting(process->saturation, int32_t{value});
 }
 
 void PCSetVideoDeintelace(VideoDecoder* stage, DEINTERLACE_STYLE style)
 {
-    if (stage != nullptr)
-        AsVideoProcess(stage)->SetDeintelace(style);
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetDeintelace(style);
 }
 
 void PCSetFlipFlag(VideoDecoder* stage, unsigned flags)
 {
-    if (stage != nullptr)
-        AsVideoProcess(stage)->SetFlipFlag(flags);
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetFlipFlag(flags);
 }
 
 void PCSetExFilterFlag(VideoDecoder* stage, unsigned flags)
 {
-    if (stage != nullptr)
-        AsVideoProcess(stage)->SetExFilterFlag(flags);
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetExFilterFlag(flags);
 }
 
 void PCSetCropRect(VideoDecoder* stage, const tagRECT* rect)
 {
-    if (stage != nullptr)
-        AsVideoProcess(stage)->SetCropRect(rect);
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetCropRect(rect);
 }
 
 void PCDisableWatermark(VideoDecoder* stage, unsigned disable)
 {
-    if (stage != nullptr)
-        AsVideoProcess(stage)->DisableWatermark(disable);
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->DisableWatermark(disable);
+}
+
+void PCSetWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagRECT* rect, int level)
+{
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetWatermarkImage(bitmap, bits, rect, level);
+}
+
+void PCSetWatermarkImageAlign(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, int align, int level)
+{
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetWatermarkImageAlign(bitmap, bits, align, level);
+}
+
+void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagFRECT* rect,
+                             int level, int conversionFlag)
+{
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetUserWatermarkImage(bitmap, bits, rect, level, conversionFlag);
+}
+
+void PCSetWatermarkSrcID(VideoDecoder* stage, void* module, const wchar_t* id, tagRECT* rect, int level)
+{
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetWatermarkSrcID(module, id, rect, level);
+}
+
+void PCSetWatermarkSrcIDAlign(VideoDecoder* stage, void* module, const wchar_t* id, int align, int level)
+{
+    if (VideoProcess* process = AsVideoProcess(stage))
+        process->SetWatermarkSrcIDAlign(module, id, align, level);
+}
+
+int PCCaptureImage(VideoDecoder* stage, wchar_t* path, int jpeg, unsigned reserved)
+{
+    VideoProcess* process = AsVideoProcess(stage);
+    return process != nullptr ? process->CaptureImage(path, jpeg, reserved) : 0;
 }

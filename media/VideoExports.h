@@ -24,8 +24,8 @@ AVPOST_API void PCVideoRelease(VideoDecoder* stage);
 // Seeks any video stage; the time reached is discarded.
 AVPOST_API void PCVideoSeek(VideoDecoder* stage, double seconds, unsigned flags);
 
-// Settings of a stage made by PCVideoInit (another kind of stage must not be passed). None
-// takes the stage's lock except PCSetCropRect; the next picture uses them.
+// Settings of a stage made by PCVideoInit; any other kind of stage is ignored. None takes the
+// stage's lock except PCSetCropRect; the next picture uses them.
 AVPOST_API void PCSetVideoBrightness(VideoDecoder* stage, int value);
 AVPOST_API void PCSetContrast(VideoDecoder* stage, int value);
 AVPOST_API void PCSetVideoSaturation(VideoDecoder* stage, int value);
@@ -37,6 +37,22 @@ AVPOST_API void PCSetExFilterFlag(VideoDecoder* stage, unsigned flags);
 AVPOST_API void PCSetCropRect(VideoDecoder* stage, const tagRECT* rect);
 // Hides the fixed watermark (nonzero) or shows it again (0) without setting its picture anew.
 AVPOST_API void PCDisableWatermark(VideoDecoder* stage, unsigned disable);
+
+// Watermarks of a stage made by PCVideoInit (see VideoProcess): the fixed watermark by
+// rectangle or alignment code, the user watermark by fractions of the output size
+// (conversionFlag != 0: a 32-bit bitmap stored bottom-up). The SrcID forms have no effect.
+AVPOST_API void PCSetWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagRECT* rect,
+                                    int level);
+AVPOST_API void PCSetWatermarkImageAlign(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, int align,
+                                         int level);
+AVPOST_API void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits,
+                                        tagFRECT* rect, int level, int conversionFlag);
+AVPOST_API void PCSetWatermarkSrcID(VideoDecoder* stage, void* module, const wchar_t* id, tagRECT* rect, int level);
+AVPOST_API void PCSetWatermarkSrcIDAlign(VideoDecoder* stage, void* module, const wchar_t* id, int align, int level);
+
+// Writes the stage's current picture as BMP (jpeg = 0) or JPEG; 1 when written, 0 otherwise
+// (also for a null stage).
+AVPOST_API int PCCaptureImage(VideoDecoder* stage, wchar_t* path, int jpeg, unsigned reserved);
 }
 
 #endif

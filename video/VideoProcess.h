@@ -20,10 +20,11 @@
 //
 // The source is not owned: it is never opened, closed by the destructor, or destroyed here.
 //
-// Threads: GetFrame and SetCropRect hold the stage's mutex for their whole run. The plain
-// settings (brightness, contrast, saturation, filter, flip, deinterlace, watermark enable,
-// level and alignment) are single 32-bit words written and read without the lock, each
-// access atomic, so a change may take effect part-way through a picture.
+// Threads: GetFrame, SetCropRect, SetUserWatermarkImage and CaptureImage hold the stage's
+// mutex for their whole run. The plain settings (brightness, contrast, saturation, filter,
+// flip, deinterlace, watermark enable, level and alignment) are single 32-bit words written
+// and read without the lock, each access atomic, so a change may take effect part-way through
+// a picture. The fixed-watermark setters take no lock either: call them between frames.
 class AVPOST_API VideoProcess : public VideoDecoder {
 public:
     // request may be null: then the output keeps the source's format. A frameRate between
@@ -53,6 +54,27 @@ public:
     void SetDeintelace(DEINTERLACE_STYLE style);
     // 0 shows the fixed watermark again, anything else hides it; the image is kept.
     void DisableWatermark(unsigned disable);
+
+    // Fixed watermark from a 32-bit bitmap with alpha (rows top-down) or a 20-bit planar one
+    // (Y, V, U, alpha packed without gaps); bits null = the pixels follow the 40-byte header.
+    // Placed by an alignment code and scaled to four fifths of the output width, aspect kept
+    // within the output height. Replaces the previous one; a refused bitmap leaves none and
+    // prints its reason on standard output. Takes no lock: call it between frames.
+    void SetWatermarkImageAlign(tagBITMAPINFO* bitmap, unsigned char* bits, int align, int level);
+    // The same placed by a rectangle in output pixels and scaled to it exactly (null rect: sized
+    // as the aligned one). A placement below 2 x 2 keeps no watermark.
+    void SetWatermarkImage(tagBITMAPINFO* bitmap, unsigned char* bits, tagRECT* rect, int level);
+    // User watermark placed by fractions of the output size; bBottomUp != 0 reads a 32-bit
+    // bitmap bottom-up. bitmap or bits equal to (void*)-1 only moves (rect) and re-levels the
+    // current one; null removes it. Holds the stage's lock, so it may run beside GetFrame.
+    void SetUserWatermarkImage(tagBITMAPINFO* bitmap, unsigned char* bits, tagFRECT* rect, int level, int bBottomUp);
+    // Accepted for compatibility; they have no effect.
+    void SetWatermarkSrcID(void* module, const wchar_t* id, tagRECT* rect, int level);
+    void SetWatermarkSrcIDAlign(void* module, const wchar_t* id, int align, int level);
+
+    // Writes the current output picture (or, before the stage made one, the input's picture) as
+    // a BMP file, or as a JPEG file when jpeg != 0. Returns 1 when written, 0 otherwise.
+    int CaptureImage(wchar_t* path, int jpeg, unsigned reserved);
 
     // Replaces outputFrame by a new black picture of the given size and returns it.
     MEDIA_FRAME* PrepareMemImage(int width, int height) const;
@@ -109,6 +131,8 @@ private:
     void BlendUserWatermark() const;
     void BlendWatermark() const;
     void RetireOutputFrame();
+    void ReleaseFixedWatermark();
+    void PrepareFixedWatermark(tagBITMAPINFO* bitmap, unsigned char* bits, const tagRECT* rect);
 };
 
 #endif

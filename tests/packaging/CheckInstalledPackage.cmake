@@ -17,6 +17,18 @@ foreach(header avpost.h media/MediaFrame.h media/StreamInfo.h media/Decoder.h vi
   endif()
 endforeach()
 
+# The run-time loaded JPEG library lies beside the library that looks for it.
+set(consumer_args "")
+if(WITH_JPEG_LIBRARY)
+  file(GLOB_RECURSE avpost_libs "${prefix}/*/libavpost.so")
+  list(GET avpost_libs 0 avpost_lib)
+  get_filename_component(avpost_lib_dir "${avpost_lib}" DIRECTORY)
+  if(NOT EXISTS "${avpost_lib_dir}/IJL15.DLL")
+    message(FATAL_ERROR "IJL15.DLL is not installed beside ${avpost_lib}")
+  endif()
+  set(consumer_args --jpeg-library)
+endif()
+
 # find_package(avpost) + avpost::avpost
 set(toolchain_arg "")
 if(TOOLCHAIN)
@@ -26,7 +38,7 @@ run(${CMAKE_COMMAND} -S "${CONSUMER_DIR}" -B "${WORK_DIR}/cmake-consumer" -G "${
     "-DCMAKE_PREFIX_PATH=${prefix}" "-DCMAKE_CXX_COMPILER=${CXX_COMPILER}" "-DCMAKE_CXX_FLAGS=${CXX_FLAGS}"
     ${toolchain_arg})
 run(${CMAKE_COMMAND} --build "${WORK_DIR}/cmake-consumer")
-run("${WORK_DIR}/cmake-consumer/consumer")
+run("${WORK_DIR}/cmake-consumer/consumer" ${consumer_args})
 if(NOT run_output MATCHES "consumer ok")
   message(FATAL_ERROR "unexpected consumer output: ${run_output}")
 endif()
@@ -46,7 +58,7 @@ endif()
 get_filename_component(lib_dir "${pc_dir}" DIRECTORY)
 run("${CXX_COMPILER}" -std=c++17 ${extra_flags} "${CONSUMER_DIR}/main.cpp" ${pc_flags}
     "-Wl,-rpath,${lib_dir}" -o "${WORK_DIR}/pc-consumer")
-run("${WORK_DIR}/pc-consumer")
+run("${WORK_DIR}/pc-consumer" ${consumer_args})
 if(NOT run_output MATCHES "consumer ok")
   message(FATAL_ERROR "unexpected consumer output: ${run_output}")
 endif()

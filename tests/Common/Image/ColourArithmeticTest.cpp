@@ -22,7 +22,7 @@ Triple TableYuv(int r, int g, int b)
         bits[i + 2] = static_cast<unsigned char>(r);
     }
     unsigned char y[4], u, v;
-    tagBITMAPINFOHEADER header = convert_test::Header(2, 2, 24);
+    tagBITMAPINFOHEADER header = BitmapHeader(2, 2, 24);
     Rgb24_2_yuv420(y, &u, &v, 2, 1, 1, &header, bits);
     EXPECT_TRUE(y[0] == y[1] && y[1] == y[2] && y[2] == y[3]);
     return {y[0], u, v};
@@ -39,7 +39,7 @@ Triple PixelYuv(int r, int g, int b)
 Triple TableRgb(unsigned char y, unsigned char u, unsigned char v)
 {
     unsigned char bits[4] = {7, 7, 7, 7};
-    tagBITMAPINFOHEADER header = convert_test::Header(1, 1, 24);
+    tagBITMAPINFOHEADER header = BitmapHeader(1, 1, 24);
     Yuv420_2_rgb24(&header, bits, &y, &u, &v, 1, 1, 1);
     EXPECT_EQ(bits[3], 7);
     return {bits[2], bits[1], bits[0]};

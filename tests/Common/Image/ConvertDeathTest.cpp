@@ -10,7 +10,6 @@
 
 namespace {
 
-using convert_test::Header;
 
 // The whole of standard error: one line naming the module, a line number and the expression.
 std::string FailureLine(const std::string& expression)
@@ -26,8 +25,8 @@ std::string FailureLine(const std::string& expression)
 
 unsigned char g_bytes[64];
 unsigned char* const b = g_bytes;
-tagBITMAPINFOHEADER g_rgb24 = Header(2, 2, 24);
-tagBITMAPINFOHEADER g_rgb32 = Header(2, 2, 32);
+tagBITMAPINFOHEADER g_rgb24 = BitmapHeader(2, 2, 24);
+tagBITMAPINFOHEADER g_rgb32 = BitmapHeader(2, 2, 32);
 
 struct Case {
     const char* name;

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "media/WinTypes.h"
+#include "support/BitmapHeader.h"
 
 namespace convert_test {
 
@@ -50,17 +51,6 @@ struct Yuv420Planes {
     bool GuardsIntact() const { return y.GuardsIntact() && u.GuardsIntact() && v.GuardsIntact(); }
     GuardedPlane y, u, v;
 };
-
-inline tagBITMAPINFOHEADER Header(int w, int h, int bitCount)
-{
-    tagBITMAPINFOHEADER header{};
-    header.biSize = sizeof(header);
-    header.biWidth = w;
-    header.biHeight = h;
-    header.biPlanes = 1;
-    header.biBitCount = static_cast<uint16_t>(bitCount);
-    return header;
-}
 
 // A bitmap of 3 or 4 bytes per pixel (24-bit rows padded to four bytes) addressed by picture row.
 struct Bitmap {

@@ -13,7 +13,6 @@ namespace {
 
 using convert_test::Bitmap;
 using convert_test::GuardedPlane;
-using convert_test::Header;
 using convert_test::Yuv420Planes;
 using Bytes = std::vector<unsigned char>;
 
@@ -61,7 +60,7 @@ void PrintTo(const Member& param, std::ostream* os)
 
 void Convert(Fn fn, Yuv420Planes& p, unsigned char* a, Bitmap& rgb, int w, int h)
 {
-    tagBITMAPINFOHEADER hdr = Header(w, h, fn == Fn::Rgb24 ? 24 : 32);
+    tagBITMAPINFOHEADER hdr = BitmapHeader(w, h, fn == Fn::Rgb24 ? 24 : 32);
     unsigned char *y = p.y.Data(), *u = p.u.Data(), *v = p.v.Data(), *bits = rgb.plane.Data();
     const int py = p.y.Pitch(), pu = p.u.Pitch(), pv = p.v.Pitch();
     switch (fn) {
@@ -146,7 +145,7 @@ TEST(RgbToYuvGeometry, ExplicitPitchAndSignedHeightPickTheFirstRow)
     EXPECT_EQ(y[6], 81);
 
     // A negative bitmap height is no picture (unlike the signed height above).
-    tagBITMAPINFOHEADER header = Header(2, -4, 32);
+    tagBITMAPINFOHEADER header = BitmapHeader(2, -4, 32);
     y[0] = 0;
     Rgb32_2_yuv420(y, u, v, 2, 1, 1, &header, bits.data());
     EXPECT_EQ(y[0], 0);
@@ -157,7 +156,7 @@ TEST(RgbToYuvGeometry, ExplicitPitchAndSignedHeightPickTheFirstRow)
 TEST(RgbToYuvAlpha, WhitePixelsKeepTheirFourthBytesInPictureOrder)
 {
     unsigned char bits[16] = {255, 255, 255, 0, 255, 255, 255, 64, 255, 255, 255, 128, 255, 255, 255, 255};
-    tagBITMAPINFOHEADER header = Header(2, 2, 32);
+    tagBITMAPINFOHEADER header = BitmapHeader(2, 2, 32);
     for (int bottomUp : {0, 1}) {
         unsigned char y[4], u, v, a[4];
         Rgb32_2_yuv420A(y, &u, &v, a, 2, 1, 1, &header, bits, bottomUp);
@@ -186,7 +185,7 @@ TEST(RgbToYuvSimple, ConvertsTheEvenPartThroughThePerPixelPath)
     for (int i = 0; i < 4; ++i)
         rgb.Pixel(i % 2, i / 2)[i == 1 || i == 2 ? 0 : 2] = 255;  // red, blue over blue, red
     Yuv420Planes yuv(3, 3, 0);
-    tagBITMAPINFOHEADER header = Header(3, 3, 24);
+    tagBITMAPINFOHEADER header = BitmapHeader(3, 3, 24);
     Rgb24_2_yuv420Simple(yuv.y.Data(), yuv.u.Data(), yuv.v.Data(), yuv.y.Pitch(), yuv.u.Pitch(), yuv.v.Pitch(),
                          &header, rgb.plane.Data());
     EXPECT_EQ(yuv.y.Bytes(0, 0, 3), (Bytes{81, 41, 0}));

@@ -11,7 +11,6 @@
 namespace {
 
 using convert_test::Bitmap;
-using convert_test::Header;
 using convert_test::Yuv420Planes;
 
 constexpr unsigned char kFill = 0x5A;
@@ -59,13 +58,13 @@ TEST_P(YuvToRgbMembers, ReplicateEachChromaSampleOverItsBlock)
                 yuv.v.At(c / 2, r / 2) = static_cast<unsigned char>(random());
             }
         Bitmap rgb(w, h, m.bytes, m.bottomUp, kFill);
-        tagBITMAPINFOHEADER header = Header(w, h, m.bytes * 8);
+        tagBITMAPINFOHEADER header = BitmapHeader(w, h, m.bytes * 8);
         m.convert(rgb, yuv, &header);
 
         for (int r = 0; r < h; ++r)
             for (int c = 0; c < w; ++c) {
                 unsigned char one[4] = {};
-                tagBITMAPINFOHEADER single = Header(1, 1, 24);
+                tagBITMAPINFOHEADER single = BitmapHeader(1, 1, 24);
                 Yuv420_2_rgb24(&single, one, &yuv.y.At(c, r), &yuv.u.At(c / 2, r / 2), &yuv.v.At(c / 2, r / 2), 1, 1,
                                1);
                 one[3] = m.fourthByte < 0 ? kFill : static_cast<unsigned char>(m.fourthByte);
@@ -86,7 +85,7 @@ TEST(YuvToRgbSimple, ConvertsTheEvenPartThroughThePerPixelPath)
     yuv.y.At(0, 0) = yuv.y.At(1, 1) = 235;
     yuv.u.At(0, 0) = yuv.v.At(0, 0) = 128;
     Bitmap rgb(3, 3, 3, true, kFill);
-    tagBITMAPINFOHEADER header = Header(3, 3, 24);
+    tagBITMAPINFOHEADER header = BitmapHeader(3, 3, 24);
     Yuv420_2_rgb24Simple(&header, rgb.plane.Data(), yuv.y.Data(), yuv.u.Data(), yuv.v.Data(), yuv.y.Pitch(),
                          yuv.u.Pitch(), yuv.v.Pitch());
     using Bytes = std::vector<unsigned char>;
