@@ -13,6 +13,7 @@ namespace avpost::tool {
 namespace {
 
 constexpr int kMostChannels = 32;
+constexpr int64_t kMostStampWobble = 50000;  // 5 ms; a larger difference is a real gap
 
 }  // namespace
 
@@ -37,6 +38,7 @@ void FfmpegAudioDecoder::OpenFile(const std::string& path)
     info_.firstTime = stream_->StartUnits();
     info_.startOffset = stream_->OffsetInFileUnits();
     nextTime_ = info_.firstTime;
+    clock_ = StampClock(kUnitsPerSecond / codec.sample_rate, std::min(stream_->TickUnits(), kMostStampWobble));
 }
 
 double FfmpegAudioDecoder::TotalSeconds() const
@@ -57,8 +59,7 @@ bool FfmpegAudioDecoder::DecodeNext()
     if (frame == nullptr)
         return false;
     const int frames = Convert(*frame);
-    const int64_t stamp = frame->best_effort_timestamp;
-    const int64_t start = stamp == AV_NOPTS_VALUE ? nextTime_ : stream_->ToUnits(stamp);
+    const int64_t start = clock_.Next(stream_->FrameStamp(*frame), frames);
     DescribeAudioBlock(block_, info_, samples_.data(), frames * info_.audio.channels * 2, start);
     nextTime_ = start + block_.duration;
     return true;
@@ -111,6 +112,7 @@ double FfmpegAudioDecoder::Seek(double seconds)
     bool landed = false;
     Guarded([&] {
         stream_->SeekBefore(target);
+        clock_.Restart();
         swr_free(&converter_);
         // Decode from the key frame up to the block that covers the target; it is handed out next.
         while ((landed = DecodeNext()) && block_.startTime + block_.duration <= target) {

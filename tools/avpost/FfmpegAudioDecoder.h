@@ -6,6 +6,7 @@
 
 #include "tools/avpost/FfmpegStream.h"
 #include "tools/avpost/Sources.h"
+#include "tools/avpost/StampClock.h"
 
 struct SwrContext;
 
@@ -37,7 +38,8 @@ private:
     std::vector<unsigned char> samples_;
     MEDIA_FRAME block_{};
     bool held_ = false;     // block_ was decoded by Seek and not handed out yet
-    int64_t nextTime_ = 0;  // where the next block starts, for frames without a stamp
+    StampClock clock_{0.0, 0};
+    int64_t nextTime_ = 0;  // where the next block starts
 };
 
 }  // namespace avpost::tool

@@ -4,6 +4,7 @@ extern "C" {
 #include <libavutil/avutil.h>
 }
 
+#include "tools/avpost/StampClock.h"
 #include "tools/avpost/ToolError.h"
 
 namespace avpost::tool {
@@ -109,6 +110,18 @@ void FfmpegStream::SeekBefore(int64_t units)
 int64_t FfmpegStream::ToUnits(int64_t timestamp) const
 {
     return av_rescale_q(timestamp, stream().time_base, kUnits);
+}
+
+int64_t FfmpegStream::FrameStamp(const AVFrame& frame) const
+{
+    const int64_t stamp = frame.best_effort_timestamp;
+    return stamp == AV_NOPTS_VALUE ? StampClock::kNoStamp : ToUnits(stamp);
+}
+
+int64_t FfmpegStream::TickUnits() const
+{
+    const int64_t tick = av_rescale_q_rnd(1, stream().time_base, kUnits, AV_ROUND_UP);
+    return tick > 0 ? tick : 1;
 }
 
 int64_t FfmpegStream::StartUnits() const

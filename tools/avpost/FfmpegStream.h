@@ -33,6 +33,10 @@ public:
 
     // A time stamp of this stream in 100 ns units.
     int64_t ToUnits(int64_t timestamp) const;
+    // The stamp of a decoded frame in 100 ns units, or StampClock::kNoStamp.
+    int64_t FrameStamp(const AVFrame& frame) const;
+    // One tick of the stream's clock in 100 ns units (at least 1).
+    int64_t TickUnits() const;
     // Where this stream begins on its own clock, and how far after the file's earliest
     // stream that is (100 ns units; 0 when unknown).
     int64_t StartUnits() const;

@@ -34,7 +34,9 @@ void FfmpegVideoDecoder::OpenFile(const std::string& path)
                   DisplayAspect(width, height, Ratio{shape.num, shape.den}));
     info_.firstTime = stream_->StartUnits();
     info_.startOffset = stream_->OffsetInFileUnits();
-    nextTime_ = info_.firstTime;
+    // Stamps may wobble by a tick of the container's clock, but never by a quarter picture.
+    const double pictureUnits = info_.video.frameRate > 0.0 ? kUnitsPerSecond / info_.video.frameRate : 0.0;
+    clock_ = StampClock(pictureUnits, std::min<int64_t>(stream_->TickUnits(), static_cast<int64_t>(pictureUnits / 4)));
 
     picture_.reset(CreateYV12Frame(width, height, false, true));
     if (!DecodeNext())
@@ -62,10 +64,7 @@ bool FfmpegVideoDecoder::DecodeNext()
     Convert(*frame);
     const double rate = info_.video.frameRate;
     picture_->duration = rate > 0.0 ? static_cast<int32_t>(ToUnits(1.0 / rate)) : 0;
-    const int64_t stamp = frame->best_effort_timestamp;
-    picture_->startTime = stamp == AV_NOPTS_VALUE ? nextTime_ : stream_->ToUnits(stamp);
-    picture_->streamTime = picture_->startTime;
-    nextTime_ = picture_->startTime + picture_->duration;
+    picture_->startTime = picture_->streamTime = clock_.Next(stream_->FrameStamp(*frame), 1);
     return true;
 }
 
@@ -87,12 +86,7 @@ int FfmpegVideoDecoder::Forward(int count)
 {
     if (!stream_ || count < 1)
         return 0;
-    int advanced = 0;
-    Guarded([&] {
-        while (advanced < count && DecodeNext())
-            ++advanced;
-    });
-    return advanced;
+    return Advance(count, [this] { return DecodeNext(); });
 }
 
 double FfmpegVideoDecoder::Seek(double seconds, unsigned)
@@ -102,6 +96,7 @@ double FfmpegVideoDecoder::Seek(double seconds, unsigned)
     const int64_t target = info_.firstTime + ToUnits(std::max(seconds, 0.0));
     Guarded([&] {
         stream_->SeekBefore(target);
+        clock_.Restart();
         // Decode from the key frame up to the picture that covers the target.
         while (DecodeNext() && picture_->startTime + picture_->duration <= target) {
         }

@@ -5,6 +5,7 @@
 
 #include "tools/avpost/FfmpegStream.h"
 #include "tools/avpost/Sources.h"
+#include "tools/avpost/StampClock.h"
 
 struct SwsContext;
 
@@ -34,7 +35,7 @@ private:
     std::unique_ptr<FfmpegStream> stream_;
     VideoFramePtr picture_;
     SwsContext* scaler_ = nullptr;
-    int64_t nextTime_ = 0;  // expected time of the next picture, for frames without a stamp
+    StampClock clock_{0.0, 0};
 };
 
 }  // namespace avpost::tool

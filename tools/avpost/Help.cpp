@@ -18,9 +18,12 @@ standard output, to pipe into an encoder. An output appears only when it is
 complete: a failed run leaves no half-written file and keeps an existing one.
 
 General options:
-  -q, --quiet      no progress line on standard error
+  -q, --quiet      no progress line and no summary on standard error
   -h, --help       help; after a command, that command's help
       --version    the version
+
+Exit status: 0 done, 1 failed (one line on standard error says why), 2 the
+command line is wrong.
 )";
 
 const char kDemo[] = R"(

@@ -82,8 +82,8 @@ tagFRECT FractionRect(const std::string& text, const char* what)
 }
 
 // A name from a list of (name, value) pairs.
-template <size_t N>
-int Named(const std::string& text, const std::pair<const char*, int> (&names)[N], const char* what)
+template <typename Value, size_t N>
+Value Named(const std::string& text, const std::pair<const char*, Value> (&names)[N], const char* what)
 {
     for (const auto& [name, value] : names)
         if (text == name)
@@ -91,13 +91,20 @@ int Named(const std::string& text, const std::pair<const char*, int> (&names)[N]
     throw Expected{what};
 }
 
-constexpr std::pair<const char*, int> kFits[] = {
-    {"stretch", 0}, {"keep", 1}, {"16:9", 2}, {"4:3", 3}, {"fill", 5}};
-constexpr std::pair<const char*, int> kInterpolations[] = {{"nearest", 1}, {"bilinear", 2}};
-constexpr std::pair<const char*, int> kDeinterlaceStyles[] = {
-    {"none", 0}, {"even", 1}, {"odd", 2}, {"even-average", 3}, {"odd-average", 4}};
-constexpr std::pair<const char*, int> kFilters[] = {{"gray", 1},         {"emboss", 2},       {"negative", 4},
-                                                    {"black-white", 8},  {"white-black", 16}, {"sepia", 32}};
+constexpr std::pair<const char*, IMAGE_RESIZE_METHOD> kFits[] = {
+    {"stretch", RESIZE_STRETCH}, {"keep", RESIZE_KEEP_ASPECT}, {"16:9", RESIZE_16_9}, {"4:3", RESIZE_4_3},
+    {"fill", RESIZE_CROP_FILL}};
+constexpr std::pair<const char*, IMAGE_INTERPOLATION> kInterpolations[] = {{"nearest", INTERPOLATION_NEAREST},
+                                                                           {"bilinear", INTERPOLATION_BILINEAR}};
+constexpr std::pair<const char*, DEINTERLACE_STYLE> kDeinterlaceStyles[] = {
+    {"none", DEINTERLACE_NONE},
+    {"even", DEINTERLACE_EVEN_DOUBLE},
+    {"odd", DEINTERLACE_ODD_DOUBLE},
+    {"even-average", DEINTERLACE_EVEN_INTERPOLATE},
+    {"odd-average", DEINTERLACE_ODD_INTERPOLATE}};
+constexpr std::pair<const char*, unsigned> kFilters[] = {
+    {"gray", kFilterGray},         {"emboss", kFilterEmboss},           {"negative", kFilterNegative},
+    {"black-white", kFilterBlackWhite}, {"white-black", kFilterWhiteBlack}, {"sepia", kFilterSepia}};
 constexpr std::pair<const char*, int> kAlignments[] = {
     {"top-left", 1}, {"top", 2},         {"top-right", 3}, {"left", 4},         {"center", 5},
     {"right", 6},    {"bottom-left", 7}, {"bottom", 8},    {"bottom-right", 9}};
@@ -148,7 +155,7 @@ void SetFilters(Invocation& call, const std::string& text)
 {
     static const char kWhat[] = "a comma-separated list of gray, emboss, negative, black-white, white-black, sepia";
     for (const std::string& name : Split(text, ','))
-        call.video.filters |= static_cast<unsigned>(Named(name, kFilters, kWhat));
+        call.video.filters |= Named(name, kFilters, kWhat);
 }
 
 void SetWatermarkPlace(Invocation& call, const std::string& text)

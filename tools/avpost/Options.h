@@ -4,6 +4,9 @@
 #include <string>
 #include <vector>
 
+#include "image/effects/Deinterlace.h"
+#include "image/resize/ImgParam.h"
+#include "image/resize/ResizeGeometry.h"
 #include "media/WinTypes.h"
 
 namespace avpost::tool {
@@ -13,6 +16,14 @@ namespace avpost::tool {
 // input is open.
 
 enum class Command { Help, Version, Demo, Video, Audio };
+
+// The video stage's colour filter bits, applied in this order.
+constexpr unsigned kFilterGray = 1;
+constexpr unsigned kFilterEmboss = 2;
+constexpr unsigned kFilterNegative = 4;
+constexpr unsigned kFilterBlackWhite = 8;
+constexpr unsigned kFilterWhiteBlack = 16;
+constexpr unsigned kFilterSepia = 32;
 
 struct Capture {
     double seconds = 0.0;  // output time at which the picture is taken
@@ -42,8 +53,8 @@ struct VideoSettings {
     bool hasRequest = false;
     int width = 0;  // 0 = the input's size, shown with square pixels
     int height = 0;
-    int fit = 1;            // the resize method: keep the picture's shape, bars around it
-    int interpolation = 2;  // bilinear
+    IMAGE_RESIZE_METHOD fit = RESIZE_KEEP_ASPECT;
+    IMAGE_INTERPOLATION interpolation = INTERPOLATION_BILINEAR;
     double frameRate = 0.0;  // 0 = the input's rate
     bool keepLastFrame = false;
     bool hasCrop = false;
@@ -51,9 +62,9 @@ struct VideoSettings {
     int brightness = 0;
     int contrast = 0;
     int saturation = 0;
-    unsigned filters = 0;  // bits: 1 gray, 2 emboss, 4 negative, 8 black-white, 16 white-black, 32 sepia
+    unsigned filters = 0;  // the stage's filter bits, see kFilterGray ...
     unsigned flips = 0;    // bits: 1 left-right, 2 upside down
-    int deinterlace = 0;
+    DEINTERLACE_STYLE deinterlace = DEINTERLACE_NONE;
     WatermarkSettings watermark;
     UserWatermarkSettings userWatermark;
     std::vector<Capture> captures;

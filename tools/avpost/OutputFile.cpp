@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "tools/avpost/InputFile.h"
+#include "tools/avpost/StandardOutput.h"
 #include "tools/avpost/ToolError.h"
 
 namespace avpost::tool {
@@ -63,6 +64,12 @@ StagedPath::~StagedPath()
         std::remove(temporary_.c_str());
 }
 
+bool StagedPath::HasContent() const
+{
+    struct stat status {};
+    return stat(temporary_.c_str(), &status) == 0 && status.st_size > 0;
+}
+
 void StagedPath::Commit()
 {
     if (std::rename(temporary_.c_str(), target_.c_str()) != 0)
@@ -73,7 +80,7 @@ void StagedPath::Commit()
 OutputFile::OutputFile(const std::string& path)
 {
     if (IsStandardStream(path)) {
-        file_ = stdout;
+        file_ = ResultStream();
         name_ = "standard output";
         return;
     }

@@ -23,6 +23,8 @@ public:
     const std::string& target() const { return target_; }
     // Where writers that take a path put the content.
     const std::string& temporary() const { return temporary_; }
+    // True once something wrote at least one byte into the temporary file.
+    bool HasContent() const;
     void Commit();
 
 private:

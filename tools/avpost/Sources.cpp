@@ -3,10 +3,22 @@
 #include <cmath>
 #include <cstdint>
 
+#include "media/AudioExports.h"
+#include "media/VideoExports.h"
 #include "tools/avpost/ToolError.h"
 #include "tools/avpost/Utf8.h"
 
 namespace avpost::tool {
+
+void VideoStageReleaser::operator()(VideoDecoder* stage) const
+{
+    PCVideoRelease(stage);
+}
+
+void AudioStageReleaser::operator()(AudioDecoder* stage) const
+{
+    PCAudioRelease(stage);
+}
 
 int SourceStatus::OpenWide(const wchar_t* path, int* result)
 {
@@ -25,6 +37,16 @@ bool SourceStatus::Guarded(const std::function<void()>& step)
         failure_ = error.what();
         return false;
     }
+}
+
+int VideoSource::Advance(int count, const std::function<bool()>& next)
+{
+    int advanced = 0;
+    Guarded([&] {
+        while (advanced < count && next())
+            ++advanced;
+    });
+    return advanced;
 }
 
 void DescribeVideo(STREAM_INFO& info, int width, int height, double frameRate, Ratio displayAspect)

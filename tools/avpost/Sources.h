@@ -44,6 +44,10 @@ public:
     const STREAM_INFO* GetStreamInfo() const override { return &info_; }
 
 protected:
+    // Forward for decoders that step one picture at a time: next() moves to the following
+    // picture and returns false at the end. Returns how far it got.
+    int Advance(int count, const std::function<bool()>& next);
+
     STREAM_INFO info_{};
 };
 
@@ -55,6 +59,16 @@ public:
 protected:
     STREAM_INFO info_{};
 };
+
+// Stages made by the exported functions, released by them.
+struct VideoStageReleaser {
+    void operator()(VideoDecoder* stage) const;
+};
+using VideoStagePtr = std::unique_ptr<VideoDecoder, VideoStageReleaser>;
+struct AudioStageReleaser {
+    void operator()(AudioDecoder* stage) const;
+};
+using AudioStagePtr = std::unique_ptr<AudioDecoder, AudioStageReleaser>;
 
 struct VideoFrameDeleter {
     void operator()(MEDIA_FRAME* frame) const { ReleaseYV12Frame(frame); }

@@ -72,12 +72,7 @@ int Y4mVideoDecoder::Forward(int count)
 {
     if (!reader_ || count < 1)
         return 0;
-    int advanced = 0;
-    Guarded([&] {
-        while (advanced < count && ReadNext())
-            ++advanced;
-    });
-    return advanced;
+    return Advance(count, [this] { return ReadNext(); });
 }
 
 double Y4mVideoDecoder::Seek(double seconds, unsigned)

@@ -14,10 +14,7 @@ using testing::TempDir;
 
 std::string Le(uint32_t value, int bytes)
 {
-    std::string out;
-    for (int i = 0; i < bytes; ++i)
-        out += static_cast<char>(value >> (8 * i) & 0xFF);
-    return out;
+    return testing::LittleEndian(value, bytes);
 }
 
 std::string BmpBytes(int width, int height, int bits, const std::string& rows, uint32_t compression = 0)

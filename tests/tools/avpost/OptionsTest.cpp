@@ -43,8 +43,8 @@ TEST(CommandLine, VideoOptionsReachTheirSettings)
     EXPECT_TRUE(v.hasRequest);
     EXPECT_EQ(v.width, 640);
     EXPECT_EQ(v.height, 480);
-    EXPECT_EQ(v.fit, 5);
-    EXPECT_EQ(v.interpolation, 1);
+    EXPECT_EQ(v.fit, RESIZE_CROP_FILL);
+    EXPECT_EQ(v.interpolation, INTERPOLATION_NEAREST);
     EXPECT_NEAR(v.frameRate, 29.97003, 1e-5);
     EXPECT_TRUE(v.keepLastFrame);
     ASSERT_TRUE(v.hasCrop);
@@ -55,9 +55,9 @@ TEST(CommandLine, VideoOptionsReachTheirSettings)
     EXPECT_EQ(v.brightness, -20);
     EXPECT_EQ(v.contrast, 15);
     EXPECT_EQ(v.saturation, 100);
-    EXPECT_EQ(v.filters, 33u);
+    EXPECT_EQ(v.filters, kFilterSepia | kFilterGray);
     EXPECT_EQ(v.flips, 3u);
-    EXPECT_EQ(v.deinterlace, 4);
+    EXPECT_EQ(v.deinterlace, DEINTERLACE_ODD_INTERPOLATE);
     EXPECT_EQ(v.watermark.image, "logo.bmp");
     EXPECT_EQ(v.watermark.align, 9);
     EXPECT_FALSE(v.watermark.hasRect);

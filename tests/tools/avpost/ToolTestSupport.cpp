@@ -126,4 +126,41 @@ std::string Probe(const std::string& path, const std::string& streamType, const 
     return value;
 }
 
+std::string LittleEndian(uint32_t value, int bytes)
+{
+    std::string out;
+    for (int i = 0; i < bytes; ++i)
+        out += static_cast<char>(value >> (8 * i) & 0xFF);
+    return out;
+}
+
+TempDir* MediaSuite::media_ = nullptr;
+
+bool MediaSuite::StartMedia()
+{
+    if (!HaveProgram("ffmpeg") || !HaveProgram("ffprobe"))
+        return false;
+    media_ = new TempDir;
+    return true;
+}
+
+void MediaSuite::TearDownTestSuite()
+{
+    delete media_;
+    media_ = nullptr;
+}
+
+void MediaSuite::SetUp()
+{
+    if (media_ == nullptr)
+        GTEST_SKIP() << "FFmpeg's ffmpeg and ffprobe are not installed";
+}
+
+void MediaSuite::Make(const std::vector<std::string>& arguments)
+{
+    std::vector<std::string> command{"ffmpeg", "-hide_banner", "-loglevel", "error", "-y"};
+    command.insert(command.end(), arguments.begin(), arguments.end());
+    ASSERT_EQ(RunProgram(command).exitCode, 0) << "making " << arguments.back();
+}
+
 }  // namespace avpost::tool::testing

@@ -1,6 +1,9 @@
 #ifndef AVPOST_TESTS_TOOLS_AVPOST_TOOLTESTSUPPORT_H
 #define AVPOST_TESTS_TOOLS_AVPOST_TOOLTESTSUPPORT_H
 
+#include <gtest/gtest.h>
+
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -43,6 +46,26 @@ bool FileExists(const std::string& path);
 // One value from ffprobe about a file's first stream of a type ("v" or "a"), such as
 // "width", "nb_read_frames" or "duration"; empty when ffprobe cannot tell.
 std::string Probe(const std::string& path, const std::string& streamType, const std::string& entry);
+
+// value as `bytes` little-endian bytes.
+std::string LittleEndian(uint32_t value, int bytes);
+
+// A suite whose media files FFmpeg's command-line tool makes once, in SetUpTestSuite of the
+// derived suite through Make; every test is skipped when ffmpeg or ffprobe is missing.
+class MediaSuite : public ::testing::Test {
+protected:
+    // Makes the media folder; false (and every test skipped) without FFmpeg's tools.
+    static bool StartMedia();
+    static void TearDownTestSuite();
+    void SetUp() override;
+
+    static std::string Media(const std::string& name) { return media_->File(name); }
+    // Runs ffmpeg quietly with these arguments, the last being the file it makes.
+    static void Make(const std::vector<std::string>& arguments);
+
+private:
+    static TempDir* media_;
+};
 
 }  // namespace avpost::tool::testing
 

@@ -21,10 +21,7 @@ using testing::WriteWholeFile;
 
 std::string Le(uint32_t value, int bytes)
 {
-    std::string out;
-    for (int i = 0; i < bytes; ++i)
-        out += static_cast<char>(value >> (8 * i) & 0xFF);
-    return out;
+    return testing::LittleEndian(value, bytes);
 }
 
 struct WavSpec {
