@@ -1,11 +1,13 @@
 #include "tools/avpost/Utf8.h"
 
+#include <cwchar>
+#include <vector>
+
+#include "support/TextEncoding.h"
 #include "tools/avpost/ToolError.h"
 
 namespace avpost::tool {
 namespace {
-
-constexpr char32_t kReplacement = 0xFFFD;
 
 bool IsContinuation(unsigned char byte)
 {
@@ -40,25 +42,6 @@ bool IsValidCodePoint(char32_t code, int length)
     return code >= kSmallest[length] && code <= 0x10FFFF && (code < 0xD800 || code > 0xDFFF);
 }
 
-void Append(std::string& out, char32_t code)
-{
-    if (code < 0x80) {
-        out += static_cast<char>(code);
-    } else if (code < 0x800) {
-        out += static_cast<char>(0xC0 | code >> 6);
-        out += static_cast<char>(0x80 | (code & 0x3F));
-    } else if (code < 0x10000) {
-        out += static_cast<char>(0xE0 | code >> 12);
-        out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
-        out += static_cast<char>(0x80 | (code & 0x3F));
-    } else {
-        out += static_cast<char>(0xF0 | code >> 18);
-        out += static_cast<char>(0x80 | (code >> 12 & 0x3F));
-        out += static_cast<char>(0x80 | (code >> 6 & 0x3F));
-        out += static_cast<char>(0x80 | (code & 0x3F));
-    }
-}
-
 }  // namespace
 
 std::wstring WideFromUtf8(const std::string& text)
@@ -85,12 +68,12 @@ std::wstring WideFromUtf8(const std::string& text)
 
 std::string Utf8FromWide(const wchar_t* text)
 {
-    std::string out;
-    for (; text != nullptr && *text != L'\0'; ++text) {
-        const auto code = static_cast<char32_t>(*text);
-        Append(out, IsValidCodePoint(code, 1) ? code : kReplacement);
-    }
-    return out;
+    if (text == nullptr)
+        return {};
+    // At most four bytes per character, and the terminator.
+    std::vector<char> buffer(std::wcslen(text) * 4 + 1, '\0');
+    WtoUTF8(text, -1, buffer.data(), static_cast<int>(buffer.size()), false);
+    return buffer.data();
 }
 
 }  // namespace avpost::tool

@@ -10,7 +10,7 @@ namespace avpost::tool {
 
 // Throws ToolError naming the text when it is not valid UTF-8.
 std::wstring WideFromUtf8(const std::string& text);
-// Code points that cannot be encoded (surrogates, values above U+10FFFF) become U+FFFD.
+// Through the library's own conversion; code points above U+10FFFF become U+FFFD.
 std::string Utf8FromWide(const wchar_t* text);
 
 }  // namespace avpost::tool

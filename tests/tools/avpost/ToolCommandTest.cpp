@@ -28,6 +28,8 @@ protected:
             return;
         Make({"-f", "lavfi", "-i", "testsrc2=size=352x288:rate=25:duration=1", "-pix_fmt", "yuv420p",
               Media("clip.y4m")});
+        Make({"-f", "lavfi", "-i", "testsrc2=size=64x48:rate=25:duration=0.2", "-pix_fmt", "yuv422p",
+              Media("422.y4m")});
         Make({"-f", "lavfi", "-i", "sine=frequency=440:sample_rate=48000:duration=1", "-ac", "2",
               Media("tone.wav")});
         Make({"-f", "lavfi", "-i", "sine=sample_rate=8000:duration=0.5", "-ac", "3", Media("three.wav")});
@@ -186,6 +188,18 @@ TEST_F(ToolRuns, ContinuousSoundFillsUpToALateStart)
     EXPECT_NE(bytes.substr(44 + 2 * 24000 + 200, 200), std::string(200, '\0'));
 }
 #endif
+
+TEST_F(ToolRuns, Y4mVariantsTheToolDoesNotReadGoToFfmpeg)
+{
+    const RunResult run = Avpost({"video", Media("422.y4m"), out_.File("out.y4m")});
+#ifdef AVPOST_TOOL_HAVE_FFMPEG
+    ASSERT_EQ(run.exitCode, 0) << run.err;
+    EXPECT_EQ(Probe(out_.File("out.y4m"), "v", "pix_fmt"), "yuv420p");
+    EXPECT_EQ(Probe(out_.File("out.y4m"), "v", "nb_read_frames"), "5");
+#else
+    ExpectOneErrorLine(run, Media("422.y4m") + ": unsupported chroma 'C422'");
+#endif
+}
 
 TEST_F(ToolRuns, BadInputsGiveOneLineAndKeepExistingOutputs)
 {
