@@ -6,6 +6,7 @@
 #include "avpost.h"
 #include "tools/avpost/OutputFile.h"
 #include "tools/avpost/Progress.h"
+#include "tools/avpost/Summary.h"
 #include "tools/avpost/ToolError.h"
 #include "tools/avpost/Utf8.h"
 #include "tools/avpost/Y4m.h"
@@ -111,7 +112,7 @@ void VideoJob::CaptureDue(double seconds, bool atEnd, VideoReport& report)
             Fail(capture.path, "the picture could not be written");
         if (capture.seconds > seconds + 1e-9)
             report.notes.push_back("--capture " + capture.path + ": the output ends before " +
-                                   std::to_string(capture.seconds) + " s; its last picture was taken");
+                                   FixedText(capture.seconds, 3) + " s; its last picture was taken");
     }
 }
 

@@ -97,9 +97,12 @@ TEST_F(ToolRuns, VideoResizesToAConstantRate)
 {
     Y4mFormat format;
     const RunResult run = Avpost({"video", Media("clip.y4m"), out_.File("out.y4m"), "--size", "160x90", "--fps",
-                                  "50", "--fit", "stretch", "--quiet"});
+                                  "50", "--fit", "stretch", "--quiet", "--capture", "99=" + out_.File("late.bmp")});
     ASSERT_EQ(run.exitCode, 0) << run.err;
-    EXPECT_EQ(run.err, "");
+    // Quiet, but a capture that differs from the request is still reported.
+    EXPECT_EQ(run.err, "avpost: --capture " + out_.File("late.bmp") +
+                           ": the output ends before 99.000 s; its last picture was taken\n");
+    EXPECT_EQ(Probe(out_.File("late.bmp"), "v", "width"), "160");
     const std::vector<std::string> pictures = Pictures(out_.File("out.y4m"), &format);
     EXPECT_EQ(format.width, 160);
     EXPECT_EQ(format.height, 90);
