@@ -18,7 +18,7 @@ standard output, to pipe into an encoder. An output appears only when it is
 complete: a failed run leaves no half-written file and keeps an existing one.
 
 General options:
-  -q, --quiet      no progress line and no summary on standard error
+  -q, --quiet      no progress line and no summary
   -h, --help       help; after a command, that command's help
       --version    the version
 
@@ -61,8 +61,8 @@ avpost video INPUT OUTPUT.y4m [options]
     --hflip, --vflip      mirror left-right, upside down
   Watermarks (BMP images; JPEG, PNG and others too when built with FFmpeg; the
   alpha of 32-bit images is kept):
-    --watermark FILE      fixed watermark, by default at its own size in the
-                          top-right corner
+    --watermark FILE      fixed watermark, by default at its own size (at most a
+                          third of the output) in the top-right corner
     --watermark-pos POS   top-left, top, top-right, left, center, right,
                           bottom-left, bottom, bottom-right (scaled to 4/5 of
                           the output width), or W:H:X:Y in output pixels

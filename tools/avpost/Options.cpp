@@ -178,14 +178,14 @@ constexpr char kLevel[] = "a level from 0 (invisible) to 100 (opaque)";
 
 enum class Scope { Video, Audio };
 
-struct OptionSpec {
+struct OptionEntry {
     const char* name;
     bool takesValue;
     Scope scope;
     void (*apply)(Invocation&, const std::string&);
 };
 
-const OptionSpec kOptions[] = {
+const OptionEntry kOptions[] = {
     {"--size", true, Scope::Video, SetSize},
     {"--fit", true, Scope::Video,
      [](Invocation& c, const std::string& v) {
@@ -244,11 +244,11 @@ const OptionSpec kOptions[] = {
     {"--continuous", false, Scope::Audio, [](Invocation& c, const std::string&) { c.audio.continuous = true; }},
 };
 
-const OptionSpec* FindOption(const std::string& name)
+const OptionEntry* FindOption(const std::string& name)
 {
-    for (const OptionSpec& spec : kOptions)
-        if (name == spec.name)
-            return &spec;
+    for (const OptionEntry& entry : kOptions)
+        if (name == entry.name)
+            return &entry;
     return nullptr;
 }
 
@@ -283,24 +283,24 @@ size_t ApplyOption(Invocation& call, const std::vector<std::string>& args, size_
         value = name.substr(equals + 1);
         name = name.substr(0, equals);
     }
-    const OptionSpec* spec = FindOption(name);
-    if (spec == nullptr)
+    const OptionEntry* entry = FindOption(name);
+    if (entry == nullptr)
         Fail(name, "unknown option (see avpost --help)");
-    const bool fits = (spec->scope == Scope::Video && call.command == Command::Video) ||
-                      (spec->scope == Scope::Audio && call.command == Command::Audio);
+    const bool fits = (entry->scope == Scope::Video && call.command == Command::Video) ||
+                      (entry->scope == Scope::Audio && call.command == Command::Audio);
     if (!fits)
-        Fail(name, std::string("is an option of 'avpost ") + (spec->scope == Scope::Video ? "video" : "audio") + "'");
+        Fail(name, std::string("is an option of 'avpost ") + (entry->scope == Scope::Video ? "video" : "audio") + "'");
     size_t used = 1;
-    if (spec->takesValue && !inlineValue) {
+    if (entry->takesValue && !inlineValue) {
         if (at + 1 >= args.size())
             Fail(name, "needs a value");
         value = args[at + 1];
         used = 2;
-    } else if (!spec->takesValue && inlineValue) {
+    } else if (!entry->takesValue && inlineValue) {
         Fail(name, "takes no value");
     }
     try {
-        spec->apply(call, value);
+        entry->apply(call, value);
     } catch (const Expected& expected) {
         Fail(name, "expected " + expected.what + ", got '" + value + "'");
     }
@@ -379,8 +379,8 @@ Invocation ParseCommandLine(const std::vector<std::string>& args)
 std::vector<std::string> OptionNames()
 {
     std::vector<std::string> names{"--quiet", "--help", "--version"};
-    for (const OptionSpec& spec : kOptions)
-        names.push_back(spec.name);
+    for (const OptionEntry& entry : kOptions)
+        names.push_back(entry.name);
     return names;
 }
 
