@@ -1,0 +1,98 @@
+#include "tools/avpost/Inputs.h"
+
+#include <cstring>
+#include <type_traits>
+
+#include "tools/avpost/InputFile.h"
+#include "tools/avpost/ToolError.h"
+#include "tools/avpost/WavAudioDecoder.h"
+#include "tools/avpost/Y4mVideoDecoder.h"
+#ifdef AVPOST_TOOL_HAVE_FFMPEG
+#include "tools/avpost/FfmpegAudioDecoder.h"
+#include "tools/avpost/FfmpegVideoDecoder.h"
+#endif
+
+namespace avpost::tool {
+namespace {
+
+#ifdef AVPOST_TOOL_HAVE_FFMPEG
+using FfmpegVideo = FfmpegVideoDecoder;
+using FfmpegAudio = FfmpegAudioDecoder;
+#else
+using FfmpegVideo = void;
+using FfmpegAudio = void;
+#endif
+
+// The first bytes of a file (fewer when it is shorter); throws when it cannot be read.
+std::string Head(const std::string& path, size_t count)
+{
+    InputFile file(path);
+    std::string head(count, '\0');
+    head.resize(file.Read(head.data(), count));
+    return head;
+}
+
+bool LooksLikeY4m(const std::string& path)
+{
+    return Head(path, 9) == "YUV4MPEG2";
+}
+
+bool LooksLikeWav(const std::string& path)
+{
+    const std::string head = Head(path, 12);
+    return head.size() == 12 && head.compare(0, 4, "RIFF") == 0 && head.compare(8, 4, "WAVE") == 0;
+}
+
+template <typename Decoder>
+std::unique_ptr<Decoder> Opened(const std::string& path)
+{
+    auto decoder = std::make_unique<Decoder>();
+    decoder->OpenFile(path);
+    return decoder;
+}
+
+// Own decoder for files that look like its format, with FFmpeg as the fallback for variants
+// it refuses; FFmpeg for everything else.
+template <typename Base, typename Own, typename Ffmpeg>
+std::unique_ptr<Base> OpenInput(const std::string& path, bool looksOwn, const char* format)
+{
+    if (IsStandardStream(path) || looksOwn) {
+        try {
+            return Opened<Own>(path);
+        } catch (const ToolError&) {
+            if constexpr (!std::is_void_v<Ffmpeg>) {
+                if (!IsStandardStream(path)) {
+                    try {
+                        return Opened<Ffmpeg>(path);
+                    } catch (const ToolError&) {
+                    }
+                }
+            }
+            throw;  // the own reader says best what is wrong
+        }
+    }
+    if constexpr (!std::is_void_v<Ffmpeg>)
+        return Opened<Ffmpeg>(path);
+    Fail(path, std::string("not a ") + format + " file (other formats need an avpost built with FFmpeg)");
+}
+
+}  // namespace
+
+std::unique_ptr<VideoSource> OpenVideoInput(const std::string& path)
+{
+    const bool y4m = !IsStandardStream(path) && LooksLikeY4m(path);
+    return OpenInput<VideoSource, Y4mVideoDecoder, FfmpegVideo>(path, y4m, "Y4M");
+}
+
+std::unique_ptr<AudioSource> OpenAudioInput(const std::string& path)
+{
+    const bool wav = !IsStandardStream(path) && LooksLikeWav(path);
+    return OpenInput<AudioSource, WavAudioDecoder, FfmpegAudio>(path, wav, "WAV");
+}
+
+std::string InputName(const std::string& path)
+{
+    return IsStandardStream(path) ? "standard input" : path;
+}
+
+}  // namespace avpost::tool
