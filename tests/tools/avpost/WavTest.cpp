@@ -24,7 +24,7 @@ std::string Le(uint32_t value, int bytes)
     return testing::LittleEndian(value, bytes);
 }
 
-struct WavSpec {
+struct WavLayout {
     uint16_t tag = 1;
     uint16_t channels = 2;
     uint32_t rate = 48000;
@@ -36,17 +36,17 @@ struct WavSpec {
     uint16_t subFormat = 0;         // non-zero: the extensible form with this sub-format
 };
 
-std::string WavBytes(const WavSpec& spec)
+std::string WavBytes(const WavLayout& layout)
 {
-    const uint16_t align = spec.blockAlign >= 0 ? static_cast<uint16_t>(spec.blockAlign)
-                                                : static_cast<uint16_t>(spec.channels * spec.bits / 8);
-    std::string fmt = Le(spec.subFormat ? 0xFFFE : spec.tag, 2) + Le(spec.channels, 2) + Le(spec.rate, 4) +
-                      Le(spec.rate * align, 4) + Le(align, 2) + Le(spec.bits, 2);
-    if (spec.subFormat)
-        fmt += Le(22, 2) + Le(spec.bits, 2) + Le(3, 4) + Le(spec.subFormat, 2) + std::string(14, '\x00');
-    const uint32_t dataSize = spec.statedDataSize ? spec.statedDataSize : static_cast<uint32_t>(spec.samples.size());
-    const std::string body = "WAVEfmt " + Le(static_cast<uint32_t>(fmt.size()), 4) + fmt + spec.beforeData + "data" +
-                             Le(dataSize, 4) + spec.samples;
+    const uint16_t align = layout.blockAlign >= 0 ? static_cast<uint16_t>(layout.blockAlign)
+                                                : static_cast<uint16_t>(layout.channels * layout.bits / 8);
+    std::string fmt = Le(layout.subFormat ? 0xFFFE : layout.tag, 2) + Le(layout.channels, 2) + Le(layout.rate, 4) +
+                      Le(layout.rate * align, 4) + Le(align, 2) + Le(layout.bits, 2);
+    if (layout.subFormat)
+        fmt += Le(22, 2) + Le(layout.bits, 2) + Le(3, 4) + Le(layout.subFormat, 2) + std::string(14, '\x00');
+    const uint32_t dataSize = layout.statedDataSize ? layout.statedDataSize : static_cast<uint32_t>(layout.samples.size());
+    const std::string body = "WAVEfmt " + Le(static_cast<uint32_t>(fmt.size()), 4) + fmt + layout.beforeData + "data" +
+                             Le(dataSize, 4) + layout.samples;
     return "RIFF" + Le(static_cast<uint32_t>(body.size()), 4) + body;
 }
 
@@ -98,17 +98,17 @@ TEST(WavFormat, WrittenFilesCarryTheirSizesAndReadBack)
 TEST(WavFormat, ReadsExtensibleHeadersSkipsOtherChunksAndStreamsWithoutSizes)
 {
     TempDir dir;
-    WavSpec extensible;
+    WavLayout extensible;
     extensible.subFormat = 1;
-    WavSpec listed;
+    WavLayout listed;
     listed.beforeData = "LIST" + Le(5, 4) + "abcde" + std::string(1, '\0');  // odd size, one pad byte
-    WavSpec streamed;
+    WavLayout streamed;
     streamed.statedDataSize = 0xFFFFFFFF;
-    for (const WavSpec& spec : {extensible, listed, streamed}) {
-        WriteWholeFile(dir.File("a.wav"), WavBytes(spec));
+    for (const WavLayout& layout : {extensible, listed, streamed}) {
+        WriteWholeFile(dir.File("a.wav"), WavBytes(layout));
         std::string samples;
         EXPECT_EQ(ReadAll(dir.File("a.wav"), &samples), "");
-        EXPECT_EQ(samples, spec.samples);
+        EXPECT_EQ(samples, layout.samples);
     }
 }
 
@@ -116,24 +116,24 @@ TEST(WavFormat, RefusesAnythingButSixteenBitPcmWithAReason)
 {
     TempDir dir;
     const auto with = [](auto change) {
-        WavSpec spec;
-        change(spec);
-        return WavBytes(spec);
+        WavLayout layout;
+        change(layout);
+        return WavBytes(layout);
     };
     const struct {
         std::string bytes;
         const char* reason;
     } cases[] = {
-        {with([](WavSpec& s) { s.bits = 8; }), "unsupported sample format: 8-bit PCM (only 16-bit PCM is read)"},
-        {with([](WavSpec& s) { s.bits = 24; }), "24-bit PCM"},
-        {with([](WavSpec& s) { s.tag = 3; s.bits = 32; }), "32-bit floating point"},
-        {with([](WavSpec& s) { s.subFormat = 3; s.bits = 32; }), "32-bit floating point"},
-        {with([](WavSpec& s) { s.tag = 0x55; }), "compressed audio (format tag 85)"},
-        {with([](WavSpec& s) { s.channels = 0; }), "unsupported channel count 0"},
-        {with([](WavSpec& s) { s.rate = 0; }), "invalid sample rate 0"},
-        {with([](WavSpec& s) { s.blockAlign = 3; }), "WAV block size 3 does not match 2 channels"},
-        {with([](WavSpec& s) { s.statedDataSize = 100; }), "truncated sample data (16 of 100 bytes)"},
-        {with([](WavSpec& s) { s.samples = std::string(18, '\0'); }), "the last sample frame is incomplete"},
+        {with([](WavLayout& s) { s.bits = 8; }), "unsupported sample format: 8-bit PCM (only 16-bit PCM is read)"},
+        {with([](WavLayout& s) { s.bits = 24; }), "24-bit PCM"},
+        {with([](WavLayout& s) { s.tag = 3; s.bits = 32; }), "32-bit floating point"},
+        {with([](WavLayout& s) { s.subFormat = 3; s.bits = 32; }), "32-bit floating point"},
+        {with([](WavLayout& s) { s.tag = 0x55; }), "compressed audio (format tag 85)"},
+        {with([](WavLayout& s) { s.channels = 0; }), "unsupported channel count 0"},
+        {with([](WavLayout& s) { s.rate = 0; }), "invalid sample rate 0"},
+        {with([](WavLayout& s) { s.blockAlign = 3; }), "WAV block size 3 does not match 2 channels"},
+        {with([](WavLayout& s) { s.statedDataSize = 100; }), "truncated sample data (16 of 100 bytes)"},
+        {with([](WavLayout& s) { s.samples = std::string(18, '\0'); }), "the last sample frame is incomplete"},
         {"RIFF" + Le(4, 4) + "WAVE", "WAV file has no data chunk"},
         {"RIFX" + Le(4, 4) + "WAVE", "not a WAV (RIFF WAVE) file"},
         {"RIFF" + Le(12, 4) + "WAVEdata" + Le(0, 4), "data chunk comes before its format chunk"},
@@ -149,13 +149,13 @@ TEST(WavFormat, RefusesAnythingButSixteenBitPcmWithAReason)
 TEST(WavAudioSource, HandsOutStampedBlocksAndSeeks)
 {
     TempDir dir;
-    WavSpec spec;
-    spec.channels = 1;
-    spec.rate = 8000;
-    spec.samples.clear();
+    WavLayout layout;
+    layout.channels = 1;
+    layout.rate = 8000;
+    layout.samples.clear();
     for (int i = 0; i < 5000; ++i)
-        spec.samples += Le(static_cast<uint32_t>(i), 2);
-    WriteWholeFile(dir.File("a.wav"), WavBytes(spec));
+        layout.samples += Le(static_cast<uint32_t>(i), 2);
+    WriteWholeFile(dir.File("a.wav"), WavBytes(layout));
     WavAudioDecoder source;
     source.OpenFile(dir.File("a.wav"));
     EXPECT_EQ(source.GetStreamInfo()->audio.bytesPerSecond, 16000);
