@@ -1,22 +1,26 @@
 #!/usr/bin/env bash
 # Installs the Debian packages the build and the tests need; does nothing when all are there.
+# Usage: scripts/install-deps.sh [--i386]   (--i386: also libjpeg for the 32-bit test build)
 set -euo pipefail
+
+with_i386=false
+[ "${1:-}" = "--i386" ] && with_i386=true
 
 packages=(cmake ninja-build g++ g++-multilib pkg-config googletest libgtest-dev libbenchmark-dev
           libjpeg62-turbo-dev
           # The command-line tool reads media files through FFmpeg's libraries; its tests use ffmpeg.
-          libavformat-dev libavcodec-dev libswscale-dev libswresample-dev libavutil-dev ffmpeg
-          "$@")
+          libavformat-dev libavcodec-dev libswscale-dev libswresample-dev libavutil-dev ffmpeg)
 # libjpeg for the 32-bit build, from Debian's i386 architecture. Without it the 32-bit build
 # still passes: it skips the JPEG decoding tests and does not build IJL15.DLL.
-i386_packages=(libjpeg62-turbo-dev:i386)
+i386_packages=()
+$with_i386 && i386_packages=(libjpeg62-turbo-dev:i386)
 
 installed() { dpkg-query -W -f='${Status}' "$1" 2>/dev/null | grep -q "install ok installed"; }
 
 missing=()
 for pkg in "${packages[@]}"; do installed "$pkg" || missing+=("$pkg"); done
 missing_i386=()
-for pkg in "${i386_packages[@]}"; do installed "$pkg" || missing_i386+=("$pkg"); done
+for pkg in "${i386_packages[@]+"${i386_packages[@]}"}"; do installed "$pkg" || missing_i386+=("$pkg"); done
 [ ${#missing[@]} -eq 0 ] && [ ${#missing_i386[@]} -eq 0 ] && exit 0
 
 sudo=""

@@ -5,7 +5,7 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-scripts/install-deps.sh
+scripts/install-deps.sh --i386
 
 jobs=$(nproc)
 build_root=${AVPOST_BUILD_ROOT:-build}
