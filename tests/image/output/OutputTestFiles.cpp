@@ -5,12 +5,12 @@
 
 #include <algorithm>
 #include <cmath>
-#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <random>
 
 #include "image/output/DibImage.h"
+#include "image/output/JpegEncoder.h"
 
 namespace avpost_test {
 
@@ -34,76 +34,42 @@ Bytes ReadFile(const std::string& path)
     return Bytes(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
 }
 
-void WriteFile(const std::string& path, const Bytes& bytes)
+void Paint(DibImage& image, int width, int height, const std::function<int(int, int, int)>& sample)
 {
-    std::ofstream(path, std::ios::binary).write(reinterpret_cast<const char*>(bytes.data()), bytes.size());
+    ASSERT_EQ(image.Create(width, height, 24), 1);
+    for (int y = 0; y < height; ++y)
+        for (int i = 0; i < 3 * width; ++i)
+            image.bits[(height - 1 - y) * image.stride + i] = static_cast<unsigned char>(sample(i / 3, y, i % 3));
 }
 
-Picture FlatPicture(int width, int height, unsigned char blue, unsigned char green, unsigned char red)
+void PaintGradient(DibImage& image, int width, int height)
 {
-    Picture p{width, height, {}};
-    for (int i = 0; i < width * height; ++i)
-        p.bgr.insert(p.bgr.end(), {blue, green, red});
-    return p;
+    Paint(image, width, height, [=](int x, int y, int c) {
+        return 20 + (c == 0 ? 190 * y / height : c == 1 ? 170 * (x + y) / (width + height) : 200 * x / width);
+    });
 }
 
-Picture GradientPicture(int width, int height)
-{
-    Picture p{width, height, Bytes(static_cast<size_t>(width) * height * 3)};
-    for (int y = 0; y < height; ++y) {
-        for (int x = 0; x < width; ++x) {
-            unsigned char* px = p.Pixel(x, y);
-            px[0] = static_cast<unsigned char>(30 + 190 * y / std::max(height, 2));
-            px[1] = static_cast<unsigned char>(40 + 170 * (x + y) / std::max(width + height, 2));
-            px[2] = static_cast<unsigned char>(20 + 200 * x / std::max(width, 2));
-        }
-    }
-    return p;
-}
-
-Picture NoisePicture(int width, int height, uint32_t seed)
+void PaintNoise(DibImage& image, int width, int height, uint32_t seed)
 {
     std::mt19937 random(seed);
-    Picture p{width, height, Bytes(static_cast<size_t>(width) * height * 3)};
-    for (unsigned char& b : p.bgr)
-        b = static_cast<unsigned char>(random());
-    return p;
+    Paint(image, width, height, [&random](int, int, int) { return static_cast<int>(random() & 0xFF); });
 }
 
-void FillDib(const Picture& picture, DibImage& image)
+Bytes EncodeJpeg(DibImage& image, const ScratchDir& dir, const std::string& name)
 {
-    ASSERT_EQ(image.Create(picture.width, picture.height, 24), 1);
-    for (int y = 0; y < picture.height; ++y)
-        std::memcpy(image.bits + static_cast<size_t>(picture.height - 1 - y) * image.stride,
-                    &picture.bgr[static_cast<size_t>(y) * picture.width * 3], static_cast<size_t>(picture.width) * 3);
+    EXPECT_EQ(image.Save(dir.File(name + ".bmp").c_str()), 1);
+    EXPECT_EQ(BMP2JPEG(dir.File(name + ".bmp").c_str(), dir.File(name + ".jpg").c_str()), 0);
+    return ReadFile(dir.File(name + ".jpg"));
 }
 
-Picture PictureOf(const DibImage& image)
+// The row padding, zero in both images, counts as matching bytes.
+double Psnr(const DibImage& a, const DibImage& b)
 {
-    const int width = image.info->bmiHeader.biWidth, height = image.info->bmiHeader.biHeight;
-    Picture p{width, height, Bytes(static_cast<size_t>(width) * height * 3)};
-    for (int y = 0; y < height; ++y)
-        std::memcpy(p.Pixel(0, y), image.bits + static_cast<size_t>(height - 1 - y) * image.stride,
-                    static_cast<size_t>(width) * 3);
-    return p;
-}
-
-void SaveBmp(const Picture& picture, const std::string& path)
-{
-    DibImage image;
-    FillDib(picture, image);
-    ASSERT_EQ(image.Save(path.c_str()), 1);
-}
-
-double Psnr(const Picture& a, const Picture& b)
-{
+    const size_t size = a.info->bmiHeader.biSizeImage;
     double squares = 0;
-    for (size_t i = 0; i < a.bgr.size(); ++i) {
-        const double difference = static_cast<double>(a.bgr[i]) - b.bgr[i];
-        squares += difference * difference;
-    }
-    const double mse = squares / static_cast<double>(a.bgr.size());
-    return mse == 0 ? 99.0 : 10.0 * std::log10(255.0 * 255.0 / mse);
+    for (size_t i = 0; i < size; ++i)
+        squares += std::pow(a.bits[i] - b.bits[i], 2);
+    return 10.0 * std::log10(255.0 * 255.0 * static_cast<double>(size) / std::max(squares, 1.0));
 }
 
 }  // namespace avpost_test

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -26,29 +27,19 @@ private:
 };
 
 Bytes ReadFile(const std::string& path);
-void WriteFile(const std::string& path, const Bytes& bytes);
 
-// A 24-bit picture, top row first, pixels blue, green, red without row padding.
-struct Picture {
-    int width = 0;
-    int height = 0;
-    Bytes bgr;
-    unsigned char* Pixel(int x, int y) { return &bgr[(static_cast<size_t>(y) * width + x) * 3]; }
-};
-
-Picture FlatPicture(int width, int height, unsigned char blue, unsigned char green, unsigned char red);
+// Makes image a 24-bit picture whose byte of channel c (0 blue, 2 red) at (x, y), counted from
+// the top row, is sample(x, y, c).
+void Paint(DibImage& image, int width, int height, const std::function<int(int, int, int)>& sample);
 // Smooth and asymmetric: red grows to the right, blue downward, green along the diagonal.
-Picture GradientPicture(int width, int height);
-Picture NoisePicture(int width, int height, uint32_t seed);
+void PaintGradient(DibImage& image, int width, int height);
+void PaintNoise(DibImage& image, int width, int height, uint32_t seed);
 
-// A 24-bit DibImage holding the picture (bottom-up rows), and the way back.
-void FillDib(const Picture& picture, DibImage& image);
-Picture PictureOf(const DibImage& image);
-// Saves the picture as a 24-bit BMP through DibImage.
-void SaveBmp(const Picture& picture, const std::string& path);
+// The file the baseline encoder makes of the image, saved as name.bmp in dir first.
+Bytes EncodeJpeg(DibImage& image, const ScratchDir& dir, const std::string& name = "picture");
 
-// Peak signal-to-noise ratio in dB over all bytes of two pictures of the same size.
-double Psnr(const Picture& a, const Picture& b);
+// Peak signal-to-noise ratio in dB between two images of one size and depth.
+double Psnr(const DibImage& a, const DibImage& b);
 
 }  // namespace avpost_test
 
