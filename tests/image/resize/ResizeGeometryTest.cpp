@@ -8,27 +8,27 @@ namespace {
 
 using Rect = std::array<int, 4>;  // x, y, cx, cy
 
-struct Decision {
-    Rect src, dst;
-};
+struct Decision { Rect src, dst; };
 
 Decision Decide(int aspectX, int aspectY, int srcW, int srcH, tagRECT crop, int dstW, int dstH, int method)
 {
     IMG_PARAM src{}, dst{};
-    CalcResizeParam(src, dst, aspectX, aspectY, srcW, srcH, &crop, dstW, dstH,
-                    static_cast<IMAGE_RESIZE_METHOD>(method));
-    EXPECT_TRUE(src.nPitch == srcW && dst.nPitch == dstW && dst.nHeight == dstH && dst.nBitCount == 8 &&
-                dst.lpBits == nullptr);
+    CalcResizeParam(src, dst, aspectX, aspectY, srcW, srcH, &crop, dstW, dstH, IMAGE_RESIZE_METHOD(method));
+    EXPECT_TRUE(src.nPitch == srcW && dst.nPitch == dstW && dst.nHeight == dstH && dst.nBitCount == 8 && !dst.lpBits);
     return {{src.x, src.y, src.cx, src.cy}, {dst.x, dst.y, dst.cx, dst.cy}};
 }
 
-TEST(ResizeGeometry, AspectPoliciesPlaceTheDestination)
+TEST(ResizeGeometry, AspectPoliciesPlaceTheDestinationCentred)
 {
     // 16:9 display size (16000, 9000) into 640 x 480: 16000 x 480 > 9000 x 640, height 360.
     for (int method : {1, 2, 4})
         EXPECT_EQ(Decide(16, 9, 720, 576, {}, 640, 480, method).dst, (Rect{0, 60, 640, 360})) << method;
     for (int method : {0, 3, 5})
         EXPECT_EQ(Decide(16, 9, 720, 576, {}, 640, 480, method).dst, (Rect{0, 0, 640, 480})) << method;
+    // 16:9 whatever the source's shape (900 / 16 = 56 rows); an odd leftover pixel stays on the
+    // right (or below).
+    EXPECT_EQ(Decide(4, 3, 720, 576, {}, 100, 100, 2).dst, (Rect{0, 22, 100, 56}));
+    EXPECT_EQ(Decide(1, 1, 8, 8, {}, 13, 10, 1).dst, (Rect{1, 0, 11, 10}));
     // A crop's display size counts: half the width of a 4:3 picture is 2:3.
     EXPECT_EQ(Decide(4, 3, 720, 576, {0, 0, 360, 576}, 640, 480, 1).dst, (Rect{160, 0, 320, 480}));
     // Without a source width the aspect cannot be applied and the pixel size is used.
@@ -48,27 +48,6 @@ TEST(ResizeGeometry, CropToFillCutsTheSourceOnly)
     IMG_PARAM src{nullptr, 1, 2, 3, 4, 5, 6, 7, 8}, dst = src;
     CalcResizeParam(src, dst, 16, 9, 720, 576, nullptr, 640, 480, RESIZE_KEEP_ASPECT);
     EXPECT_EQ(src.nWidth + dst.cy, 1 + 8);  // no crop rectangle: nothing is touched
-}
-
-TEST(ResizeRect, CentresWithTheOddPixelRightOrBelow)
-{
-    const struct {
-        tagRECT rect;
-        tagSIZE size;
-        int method;
-        Rect expected;  // left, top, right, bottom
-    } cases[] = {
-        {{0, 0, 13, 10}, {1, 1}, 1, {1, 0, 12, 10}},     // 10 columns and the odd one
-        {{0, 0, 100, 100}, {16, 9}, 2, {0, 22, 100, 78}},  // 900 / 16 = 56 rows
-        {{0, 0, 100, 100}, {1000, 1}, 2, {0, 22, 100, 78}},  // the shape of size only picks 16:9
-        {{0, 0, 100, 100}, {4, 3}, 3, {0, 12, 100, 88}},   // 75 rows and the odd one
-        {{10, 10, 50, 40}, {4, 3}, 1, {10, 10, 50, 40}},   // already 4:3
-        {{0, 0, 50, 40}, {0, 3}, 1, {0, 0, 50, 40}},
-    };
-    for (auto c : cases) {
-        ResizeRect(c.rect, c.size, static_cast<IMAGE_RESIZE_METHOD>(c.method));
-        EXPECT_EQ((Rect{c.rect.left, c.rect.top, c.rect.right, c.rect.bottom}), c.expected);
-    }
 }
 
 }  // namespace
