@@ -2,8 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdlib>
-#include <cstring>
 #include <vector>
 
 #include "audio/AudioEvenProcess.h"
@@ -14,7 +14,7 @@ namespace {
 
 using Source = ScriptedAudioDecoder;
 
-TEST(AudioExports, CreateSetSeekAndReleaseIgnoringNullStages)
+TEST(AudioExports, CreateSetSeekAndReleaseIgnoringNullAndOtherStages)
 {
     EXPECT_EQ(PCAudioInit(nullptr, 44100, 2, 16, 1), nullptr);
     EXPECT_EQ(PEAudioCreate(nullptr), nullptr);
@@ -30,7 +30,6 @@ TEST(AudioExports, CreateSetSeekAndReleaseIgnoringNullStages)
     PCAudioSeek(stage, 1.5);
     EXPECT_EQ(source.seekRequests.back(), 1.5);
     PCAudioRelease(stage);
-
     AudioDecoder* even = PEAudioCreate(&source);
     EXPECT_EQ(even->GetStreamInfo(), source.GetStreamInfo());
     PCSetVolum(even, 50);  // no volume on this kind of stage: left alone
@@ -38,77 +37,35 @@ TEST(AudioExports, CreateSetSeekAndReleaseIgnoringNullStages)
     EXPECT_EQ(source.closeCalls, 0);
 }
 
-// A decoder whose blocks leave a gap at the start, a gap in the middle and an overlap, pulled
-// through a continuous stage, a 44.1 kHz stereo -> 22.05 kHz mono conversion and volume 50.
-class AudioPipeline : public testing::Test {
-protected:
-    void SetUp() override
-    {
-        CAudioConverter::s_dSpare = 0.0;
-        auto steady = [](int frames) { return Source::Samples(std::vector<int16_t>(2 * static_cast<size_t>(frames), 1000)); };
-        source.Add(source.TimeOf(4410), steady(8820));    // 0.1 s late
-        source.Add(source.TimeOf(15435), steady(4410));   // 0.05 s gap before it
-        source.Add(source.TimeOf(19404), steady(4410));   // 0.01 s overlap
-        stage = PCAudioInit(&source, 22050, 1, 16, 1);
-        PCSetVolum(stage, 50);
-    }
-    void TearDown() override { PCAudioRelease(stage); }
-
-    struct Pulled {
-        std::vector<short> samples;
-        std::vector<const MEDIA_FRAME*> frames;
-        std::vector<int64_t> starts, durations;
-    };
-    Pulled PullAll()
-    {
-        Pulled pulled;
-        while (const MEDIA_FRAME* frame = stage->GetNextFrame()) {
-            EXPECT_EQ(frame->param1, 22050);
-            EXPECT_EQ(frame->param2, 1);
-            const short* samples = reinterpret_cast<const short*>(frame->data);
-            pulled.samples.insert(pulled.samples.end(), samples, samples + frame->dataSize / 2);
-            pulled.starts.push_back(frame->startTime);
-            pulled.durations.push_back(frame->duration);
-        }
-        return pulled;
-    }
-
-    Source source{44100, 2, 16};
-    AudioDecoder* stage = nullptr;
-};
-
-TEST_F(AudioPipeline, GapsAndOverlapsBecomeOneGaplessConvertedTimeLine)
+// Blocks with a gap at the start, a gap in the middle and an overlap, through a continuous
+// stage, a 44.1 kHz stereo to 22.05 kHz mono conversion and volume 50: one gapless time line.
+TEST(AudioExports, ContinuousConvertedStageAtHalfVolume)
 {
-    const Pulled pulled = PullAll();
-    // 0.54 s on the time line: 11,907 mono samples at 22.05 kHz.
-    EXPECT_LE(std::labs(static_cast<long>(pulled.samples.size()) - 11907), 2);
-    ASSERT_FALSE(pulled.starts.empty());
-    EXPECT_EQ(pulled.starts[0], 0);
-    for (size_t i = 1; i < pulled.starts.size(); ++i)
-        EXPECT_LE(std::llabs(pulled.starts[i] - (pulled.starts[i - 1] + pulled.durations[i - 1])), 5) << i;
-
-    // Silence until the first block (0.1 s), then the steady level at half volume throughout,
-    // the middle gap filled with the last sample frame.
-    size_t silent = 0;
-    while (silent < pulled.samples.size() && pulled.samples[silent] == 0)
-        ++silent;
-    EXPECT_LE(std::labs(static_cast<long>(silent) - 2205), 2);
-    size_t firstSteady = silent;
-    while (firstSteady < pulled.samples.size() && pulled.samples[firstSteady] != 500)
-        ++firstSteady;
-    EXPECT_LE(firstSteady - silent, 1u);
-    for (size_t i = firstSteady; i < pulled.samples.size(); ++i)
-        ASSERT_EQ(pulled.samples[i], 500) << i;
-}
-
-TEST_F(AudioPipeline, SeekingBackRestartsTheTimeLineWithTheLastSampleFrameAsFiller)
-{
-    PullAll();
-    PCAudioSeek(stage, 0.0);
-    const MEDIA_FRAME* frame = stage->GetNextFrame();
-    ASSERT_NE(frame, nullptr);
-    EXPECT_EQ(frame->startTime, 0);
-    EXPECT_EQ(reinterpret_cast<const short*>(frame->data)[frame->dataSize / 2 - 1], 500);
+    CAudioConverter::s_dSpare = 0.0;
+    Source source(44100, 2, 16);
+    const auto steady = [](int frames) { return Source::Samples(std::vector<int16_t>(2 * size_t(frames), 1000)); };
+    source.Add(source.TimeOf(4410), steady(8820));   // 0.1 s late
+    source.Add(source.TimeOf(15435), steady(4410));  // 0.05 s gap before it
+    source.Add(source.TimeOf(19404), steady(4410));  // 0.01 s overlap
+    AudioDecoder* stage = PCAudioInit(&source, 22050, 1, 16, 1);
+    PCSetVolum(stage, 50);
+    std::vector<short> samples;
+    int64_t next = 0;
+    while (const MEDIA_FRAME* frame = stage->GetNextFrame()) {
+        EXPECT_EQ((std::vector<int>{frame->param1, frame->param2}), (std::vector<int>{22050, 1}));
+        EXPECT_LE(std::llabs(frame->startTime - next), 5);
+        next = frame->startTime + frame->duration;
+        const short* data = reinterpret_cast<const short*>(frame->data);
+        samples.insert(samples.end(), data, data + frame->dataSize / 2);
+    }
+    PCAudioRelease(stage);
+    // 0.54 s: silence until the first block, then the steady level halved, the gap filled.
+    const long silent = std::find_if(samples.begin(), samples.end(), [](short s) { return s != 0; }) - samples.begin();
+    const long level = std::find(samples.begin(), samples.end(), 500) - samples.begin();
+    EXPECT_LE(std::labs(static_cast<long>(samples.size()) - 11907), 2);
+    EXPECT_LE(std::labs(silent - 2205), 2);
+    EXPECT_LE(level - silent, 1);
+    EXPECT_EQ(std::count(samples.begin() + level, samples.end(), 500), static_cast<long>(samples.size()) - level);
 }
 
 }  // namespace

@@ -3,104 +3,73 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <memory>
 #include <vector>
+
+#include "support/VideoFrames.h"
 
 namespace {
 
-struct FrameDeleter {
-    void operator()(MEDIA_FRAME* f) const { ReleaseYV12Frame(f); }
-};
-using FramePtr = std::unique_ptr<MEDIA_FRAME, FrameDeleter>;
+using Ints = std::vector<int>;
+using Times = std::vector<int64_t>;
 
-bool AllEqual(const unsigned char* p, size_t n, unsigned char value)
+bool AllEqual(const unsigned char* p, int n, unsigned char value)
 {
     return std::all_of(p, p + n, [value](unsigned char b) { return b == value; });
 }
 
-TEST(CreateYV12Frame, OddSizeLayoutAndClearing)
+TEST(CreateYV12Frame, OneBlockInYvuOrderClearedToBlack)
 {
-    FramePtr f(CreateYV12Frame(5, 3, false, true));
-    ASSERT_NE(f, nullptr);
-    EXPECT_EQ(f->type, 2);
-    EXPECT_EQ(f->param1, 1);
-    EXPECT_EQ(f->param2, 2);
-    EXPECT_EQ(f->width, 5);
-    EXPECT_EQ(f->height, 3);
-    EXPECT_EQ(f->pitch[0], 5);
-    EXPECT_EQ(f->pitch[1], 3);
-    EXPECT_EQ(f->pitch[2], 3);
-    EXPECT_EQ(f->plane[2], f->plane[0] + 15);  // V follows Y
-    EXPECT_EQ(f->plane[1], f->plane[0] + 21);  // then U
-    EXPECT_EQ(f->plane[3], nullptr);
-    EXPECT_TRUE(AllEqual(f->plane[0], 15, 16));
-    EXPECT_TRUE(AllEqual(f->plane[2], 12, 128));
-    EXPECT_EQ(f->startTime, -1);
-    EXPECT_EQ(f->streamTime, -1);
-    EXPECT_EQ(f->duration, 0);
-    EXPECT_EQ(f->reserved[0], 0);
-    EXPECT_EQ(f->reserved[1], 0);
-}
-
-TEST(CreateYV12Frame, AlphaPlaneFollowsChromaAndIsOpaque)
-{
-    FramePtr f(CreateYV12Frame(4, 4, true, true));
-    ASSERT_NE(f, nullptr);
-    EXPECT_EQ(f->plane[3], f->plane[0] + 24);
-    EXPECT_TRUE(AllEqual(f->plane[3], 16, 255));
-}
-
-TEST(CreateYV12Frame, EmptyAndNegativeSizes)
-{
-    FramePtr empty(CreateYV12Frame(0, 0, true, true));
-    ASSERT_NE(empty, nullptr);
-    EXPECT_EQ(empty->pitch[1], 0);
+    const struct {
+        int width, height;
+        bool alpha;
+        int chromaPitch, vAt, uAt, alphaAt;  // offsets from the luma plane
+    } cases[] = {{5, 3, false, 3, 15, 21, 0}, {4, 4, true, 2, 16, 20, 24}, {0, 0, true, 0, 0, 0, 0}};
+    for (const auto& c : cases) {
+        SCOPED_TRACE(&c - cases);
+        FramePtr f = NewFrame(c.width, c.height, c.alpha);
+        const unsigned char* y = f->plane[0];
+        EXPECT_EQ((Ints{f->type, f->param1, f->param2, f->width, f->height, f->pitch[0], f->pitch[1], f->pitch[2]}),
+                  (Ints{2, 1, 2, c.width, c.height, c.width, c.chromaPitch, c.chromaPitch}));
+        EXPECT_EQ((Ints{int(f->plane[2] - y), int(f->plane[1] - y)}), (Ints{c.vAt, c.uAt}));
+        EXPECT_EQ(f->plane[3], c.alpha ? y + c.alphaAt : nullptr);
+        EXPECT_TRUE(AllEqual(y, c.vAt, 16) && AllEqual(f->plane[2], 2 * (c.uAt - c.vAt), 128));
+        EXPECT_TRUE(!c.alpha || AllEqual(f->plane[3], c.vAt, 255));
+        EXPECT_EQ((Times{f->startTime, f->streamTime, f->duration, f->reserved[0], f->reserved[1]}),
+                  (Times{-1, -1, 0, 0, 0}));
+    }
     EXPECT_EQ(CreateYV12Frame(-2, 4, false, true), nullptr);
 }
 
-TEST(CopyVideoFrame, CopiesRowsAcrossPitchesAndLeavesTimesWhenAsked)
+TEST(CopyVideoFrame, CopiesRowsAcrossPitchesAndTimesOnlyWhenAsked)
 {
-    // A source with pitch 8 holding a 6 x 3 picture, copied into a tightly packed frame.
-    FramePtr src(CreateYV12Frame(8, 3, false, true));
+    // A 6 x 3 picture in rows of 8, copied into a tightly packed frame.
+    FramePtr src = NewFrame(8, 3);
     src->width = 6;
-    for (int i = 0; i < 8 * 3; ++i)
+    for (int i = 0; i < 8 * 3 + 2 * 4 * 2; ++i)
         src->plane[0][i] = static_cast<unsigned char>(i);
-    for (int i = 0; i < 4 * 2; ++i) {
-        src->plane[1][i] = static_cast<unsigned char>(100 + i);
-        src->plane[2][i] = static_cast<unsigned char>(200 + i);
-    }
     src->startTime = 5;
     src->streamTime = 6;
     src->duration = 7;
-
-    FramePtr dst(CreateYV12Frame(6, 3, false, true));
-    dst->startTime = 11;
+    FramePtr dst = NewFrame(6, 3);
     CopyVideoFrame(dst.get(), src.get(), false);
-    for (int y = 0; y < 3; ++y)
-        for (int x = 0; x < 6; ++x)
-            EXPECT_EQ(dst->plane[0][y * 6 + x], y * 8 + x);
-    for (int y = 0; y < 2; ++y)
-        for (int x = 0; x < 3; ++x) {
-            EXPECT_EQ(dst->plane[1][y * 3 + x], 100 + y * 4 + x);
-            EXPECT_EQ(dst->plane[2][y * 3 + x], 200 + y * 4 + x);
+    for (int p = 0; p < 3; ++p) {
+        for (int y = 0; y < (p == 0 ? 3 : 2); ++y) {
+            for (int x = 0; x < (p == 0 ? 6 : 3); ++x)
+                EXPECT_EQ(dst->plane[p][y * dst->pitch[p] + x], src->plane[p][y * src->pitch[p] + x]) << p;
         }
-    EXPECT_EQ(dst->startTime, 11);
-    EXPECT_EQ(dst->streamTime, -1);
-
+    }
+    EXPECT_EQ((Times{dst->startTime, dst->streamTime, dst->duration}), (Times{-1, -1, 0}));
     CopyVideoFrame(dst.get(), src.get(), true);
-    EXPECT_EQ(dst->startTime, 5);
-    EXPECT_EQ(dst->streamTime, 6);
-    EXPECT_EQ(dst->duration, 7);
+    EXPECT_EQ((Times{dst->startTime, dst->streamTime, dst->duration}), (Times{5, 6, 7}));
 }
 
 TEST(CopyVideoFrame, EqualPitchesCopyWholePlanesButNeverAlpha)
 {
-    FramePtr src(CreateYV12Frame(5, 5, true, false));
+    FramePtr src(CreateYV12Frame(5, 5, true, false), ReleaseYV12Frame);
     std::fill_n(src->plane[0], 25 + 2 * 9 + 25, 77);
-    FramePtr dst(CreateYV12Frame(5, 5, true, true));
+    FramePtr dst = NewFrame(5, 5, true);
     CopyVideoFrame(dst.get(), src.get(), true);
-    EXPECT_TRUE(AllEqual(dst->plane[0], 25, 77));
-    EXPECT_TRUE(AllEqual(dst->plane[2], 18, 77));
+    EXPECT_TRUE(AllEqual(dst->plane[0], 25, 77) && AllEqual(dst->plane[2], 18, 77));
     EXPECT_TRUE(AllEqual(dst->plane[3], 25, 255));
     CopyVideoFrame(nullptr, src.get(), true);
     CopyVideoFrame(dst.get(), nullptr, true);
@@ -109,17 +78,9 @@ TEST(CopyVideoFrame, EqualPitchesCopyWholePlanesButNeverAlpha)
 TEST(AudioFrame, CreateZeroedAndRelease)
 {
     MEDIA_FRAME* f = CreateAudioFrame(48000, 2, 16, 4096);
-    ASSERT_NE(f, nullptr);
-    EXPECT_EQ(f->type, 3);
-    EXPECT_EQ(f->param1, 48000);
-    EXPECT_EQ(f->param2, 2);
-    EXPECT_EQ(f->bitsPerSample, 16);
-    EXPECT_EQ(f->bufferSize, 4096);
-    EXPECT_EQ(f->dataSize, 0);
-    EXPECT_EQ(f->startTime, -1);
-    EXPECT_EQ(f->streamTime, -1);
-    EXPECT_EQ(f->duration, 0);
-    EXPECT_EQ(f->width, 0);
+    EXPECT_EQ((Ints{f->type, f->param1, f->param2, f->bitsPerSample, f->bufferSize, f->dataSize, f->width}),
+              (Ints{3, 48000, 2, 16, 4096, 0, 0}));
+    EXPECT_EQ((Times{f->startTime, f->streamTime, f->duration}), (Times{-1, -1, 0}));
     EXPECT_TRUE(AllEqual(f->data, 4096, 0));
     ReleaseAudioFrame(f);
     ReleaseAudioFrame(nullptr);

@@ -2,7 +2,6 @@
 #define AVPOST_TESTS_SUPPORT_SCRIPTEDVIDEODECODER_H
 
 #include <cstdint>
-#include <cstring>
 #include <random>
 #include <vector>
 
@@ -10,17 +9,15 @@
 #include "media/MediaFrame.h"
 
 // A video source that plays a fixed list of picture times (100 ns units). Each picture is a
-// small frame whose luma holds its index, so tests can tell which picture they were given.
+// small frame whose first luma byte holds its index, so tests can tell which one they got.
 class ScriptedVideoDecoder : public VideoDecoder {
 public:
     ScriptedVideoDecoder(std::vector<int64_t> times, double frameRate, int width = 4, int height = 4)
-        : times_(std::move(times))
+        : times_(std::move(times)), info_(), picture_(CreateYV12Frame(width, height, false, true))
     {
-        std::memset(&info_, 0, sizeof(info_));
         info_.video.width = width;
         info_.video.height = height;
         info_.video.frameRate = frameRate;
-        picture_ = CreateYV12Frame(width, height, false, true);
         Show(0);
     }
     ~ScriptedVideoDecoder() override { ReleaseYV12Frame(picture_); }
@@ -36,82 +33,63 @@ public:
 
     void Close() override { ++closeCalls; }
     int Open(const wchar_t*, const DecParam*, int*) override { return 1; }
-    int SetExDecodeParam(unsigned, unsigned, unsigned) override { return exDecodeResult; }
+    int SetExDecodeParam(unsigned, unsigned, unsigned) override { return 0; }
     const STREAM_INFO* GetStreamInfo() const override { return &info_; }
+    // Lands on the first picture at or after the request, or on the last one.
     double Seek(double seconds, unsigned flags) override
     {
         lastSeekRequest = seconds;
         lastSeekFlags = flags;
-        if (times_.empty())
-            return 0.0;
-        const auto target = static_cast<int64_t>(seconds * 10000000.0) + info_.firstTime;
         size_t i = 0;
-        while (i + 1 < times_.size() && times_[i] < target)
+        while (i + 1 < times_.size() && times_[i] < seconds * 10000000.0 + info_.firstTime)
             ++i;
         Show(i);
-        return static_cast<double>(times_[i] - info_.firstTime) / 10000000.0;
+        return GetOffset();
     }
-    double GetOffset() const override
-    {
-        return times_.empty() ? 0.0 : static_cast<double>(times_[index_]) / 10000000.0;
-    }
+    double GetOffset() const override { return showing_ ? times_[index_] / 10000000.0 : 0.0; }
     MEDIA_FRAME* GetFrame() const override { return showing_ ? picture_ : nullptr; }
     int Forward(int count) override
     {
-        ++forwardCalls;
-        if (index_ + count >= times_.size()) {
-            if (pictureGoneAtEnd)
-                showing_ = false;
-            return 0;
+        if (index_ + count < times_.size()) {
+            Show(index_ + count);
+            return 1;
         }
-        Show(index_ + count);
-        return 1;
+        showing_ = showing_ && !pictureGoneAtEnd;
+        return 0;
     }
 
-    // Fills the picture with fixed-seed noise in studio range; the first luma byte keeps the index.
+    // Fills Y, V and U (one block) with fixed-seed noise in studio range; keeps the index byte.
     void Paint(unsigned seed)
     {
         std::mt19937 random(seed);
-        const int lumaSize = picture_->width * picture_->height;
-        const int chromaSize = ((picture_->width + 1) / 2) * ((picture_->height + 1) / 2);
-        const unsigned char index = picture_->plane[0][0];
-        for (int i = 0; i < lumaSize; ++i)
+        const int chroma = ((picture_->width + 1) / 2) * ((picture_->height + 1) / 2);
+        for (int i = 1; i < picture_->width * picture_->height + 2 * chroma; ++i)
             picture_->plane[0][i] = static_cast<unsigned char>(16 + random() % 220);
-        for (int i = 0; i < chromaSize; ++i) {
-            picture_->plane[1][i] = static_cast<unsigned char>(16 + random() % 225);
-            picture_->plane[2][i] = static_cast<unsigned char>(16 + random() % 225);
-        }
-        picture_->plane[0][0] = index;
     }
 
-    // The index of the picture a frame shows (its first luma byte).
     static int IndexOf(const MEDIA_FRAME* frame) { return frame->plane[0][0]; }
-
     STREAM_INFO& info() { return info_; }
-    size_t index() const { return index_; }
 
     double lastSeekRequest = -1.0;
     unsigned lastSeekFlags = 0;
-    int forwardCalls = 0;
     int closeCalls = 0;
     bool pictureGoneAtEnd = false;
-    int exDecodeResult = 0;
 
 private:
     void Show(size_t i)
     {
         index_ = i;
-        showing_ = !times_.empty();
-        if (!showing_)
-            return;
-        picture_->startTime = picture_->streamTime = times_[i];
-        picture_->duration = 400000;
-        picture_->plane[0][0] = static_cast<unsigned char>(i);
+        showing_ = i < times_.size();
+        if (showing_) {
+            picture_->startTime = picture_->streamTime = times_[i];
+            picture_->duration = 400000;
+            picture_->plane[0][0] = static_cast<unsigned char>(i);
+        }
     }
 
     std::vector<int64_t> times_;
     STREAM_INFO info_;
-    MEDIA_FRAME* picture_ = nullptr;
+    MEDIA_FRAME* picture_;
     size_t index_ = 0;
     bool showing_ = false;
 };

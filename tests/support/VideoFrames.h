@@ -6,15 +6,12 @@
 
 #include "media/MediaFrame.h"
 
-// A video frame made by CreateYV12Frame, released with it.
-struct FrameDeleter {
-    void operator()(MEDIA_FRAME* frame) const { ReleaseYV12Frame(frame); }
-};
-using FramePtr = std::unique_ptr<MEDIA_FRAME, FrameDeleter>;
+// A video frame made by CreateYV12Frame (cleared to black), released with it.
+using FramePtr = std::unique_ptr<MEDIA_FRAME, void (*)(MEDIA_FRAME*)>;
 
 inline FramePtr NewFrame(int width, int height, bool withAlpha = false)
 {
-    return FramePtr(CreateYV12Frame(width, height, withAlpha, true));
+    return FramePtr(CreateYV12Frame(width, height, withAlpha, true), ReleaseYV12Frame);
 }
 
 // A packed copy of a picture, times included.
@@ -25,20 +22,15 @@ inline FramePtr CopyOf(const MEDIA_FRAME* picture)
     return copy;
 }
 
-// Whether two pictures have the same size and the same Y, U and V samples (pitches may differ).
+// Whether two packed pictures (pitches equal to their widths) have the same size and samples.
 inline bool SamePicture(const MEDIA_FRAME* a, const MEDIA_FRAME* b)
 {
     if (a == nullptr || b == nullptr || a->width != b->width || a->height != b->height)
         return false;
-    const int widths[3] = {a->width, (a->width + 1) / 2, (a->width + 1) / 2};
-    const int rows[3] = {a->height, (a->height + 1) / 2, (a->height + 1) / 2};
-    for (int p = 0; p < 3; ++p) {
-        for (int r = 0; r < rows[p]; ++r) {
-            if (std::memcmp(a->plane[p] + r * a->pitch[p], b->plane[p] + r * b->pitch[p], widths[p]) != 0)
-                return false;
-        }
-    }
-    return true;
+    const size_t luma = static_cast<size_t>(a->width) * a->height;
+    const size_t chroma = static_cast<size_t>((a->width + 1) / 2) * ((a->height + 1) / 2);
+    return a->pitch[0] == a->width && b->pitch[0] == b->width && std::memcmp(a->plane[0], b->plane[0], luma) == 0 &&
+           std::memcmp(a->plane[1], b->plane[1], chroma) == 0 && std::memcmp(a->plane[2], b->plane[2], chroma) == 0;
 }
 
 #endif

@@ -2,7 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include <cstring>
+#include <cmath>
 #include <vector>
 
 #include "media/VideoExports.h"
@@ -11,192 +11,97 @@
 namespace {
 
 using Source = ScriptedVideoDecoder;
+using Ints = std::vector<int>;
 
-std::vector<int> PullIndices(VideoEvenProcess& stage, int steps, std::vector<int64_t>* times = nullptr)
+// The picture indices before and after each step; each picture a step hands out carries its
+// tick's time (start and stream) and the tick length.
+Ints Steps(VideoEvenProcess& stage, const Ints& counts)
 {
-    std::vector<int> indices{Source::IndexOf(stage.GetFrame())};
-    if (times)
-        times->push_back(stage.GetFrame()->startTime);
-    for (int i = 0; i < steps; ++i) {
-        EXPECT_EQ(stage.Forward(1), 1);
-        indices.push_back(Source::IndexOf(stage.GetFrame()));
-        if (times)
-            times->push_back(stage.GetFrame()->startTime);
+    Ints indices{Source::IndexOf(stage.GetFrame())};
+    for (int count : counts) {
+        EXPECT_EQ(stage.Forward(count), count);
+        const MEDIA_FRAME& f = *stage.GetFrame();
+        const int64_t tick = std::llround(stage.position * 1e7 / stage.frameRate);
+        EXPECT_EQ((std::vector<int64_t>{f.startTime, f.streamTime, f.duration}),
+                  (std::vector<int64_t>{tick, tick, std::llround(1e7 / stage.frameRate)}));
+        indices.push_back(Source::IndexOf(&f));
     }
     return indices;
 }
 
-TEST(VideoEvenRate, ZeroTakesTheSourceRateAndHighRatesFallBackToThirty)
+TEST(VideoEvenStep, RepeatsDropsAndMultiTickSteps)
 {
-    Source source(Source::Regular(25, 10), 25.0);
-    std::memset(source.info().header, 0xAB, sizeof(source.info().header));
-    source.info().tail[7] = 9;
-
-    VideoEvenProcess same(&source, 0.0);
-    EXPECT_EQ(same.frameRate, 25.0);
-    ASSERT_NE(same.GetStreamInfo(), nullptr);
-    EXPECT_EQ(double{same.GetStreamInfo()->video.frameRate}, 25.0);
-    EXPECT_EQ(same.GetStreamInfo()->header[1035], 0xAB);
-    EXPECT_EQ(same.GetStreamInfo()->tail[7], 9);
-    EXPECT_EQ(same.GetFrame()->duration, 400000);
-
-    VideoEvenProcess fast(&source, 240.0);
-    EXPECT_EQ(fast.frameRate, 30.0);
-    EXPECT_EQ(double{fast.GetStreamInfo()->video.frameRate}, 30.0);
-    EXPECT_EQ(fast.GetFrame()->duration, 333333);
-    EXPECT_EQ(fast.GetFrame()->startTime, 0);
+    const struct {
+        std::vector<int64_t> times;
+        double sourceRate, rate;
+        Ints counts, indices;
+        int64_t firstTime;
+    } cases[] = {
+        {Source::Regular(25, 20), 25, 50, {1, 1, 1, 1, 1, 1}, {0, 1, 1, 2, 2, 3, 3}, 0},
+        {Source::Regular(50, 20), 50, 25, {1, 1, 1, 1}, {0, 2, 4, 6, 8}, 0},  // exact hits
+        {{0, 300000, 1000000, 1100000, 1300000, 2500000}, 25, 25, {3, 0, 1, 1, 1}, {0, 4, 4, 5, 5, 5}, 0},
+        {Source::Regular(25, 10), 25, 25, {1}, {0, 3}, 800000},  // pictures before the stream start
+        {Source::Regular(25, 10), 25, 240, {6}, {0, 5}, 0},      // above 200 per second: 30
+        {Source::Regular(25, 3), 25, 0, {5}, {0, 2}, 0},         // the source's rate; it ends mid-step
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(&c - cases);
+        Source source(c.times, c.sourceRate);
+        source.info().firstTime = c.firstTime;
+        VideoEvenProcess stage(&source, c.rate);
+        EXPECT_EQ(Steps(stage, c.counts), c.indices);
+        EXPECT_EQ(double{stage.GetStreamInfo()->video.frameRate}, stage.frameRate);
+    }
 }
 
-TEST(VideoEvenRate, SourceWithoutRateIsRefused)
+TEST(VideoEvenEnd, StepsPastTheEndKeepOrDropThePicture)
 {
-    Source source(Source::Regular(25, 5), 0.0);
-    EXPECT_EQ(PEVideoCreate(&source, 0.0), nullptr);
-    EXPECT_EQ(PEVideoCreate(&source, -3.0), nullptr);
-    EXPECT_EQ(PEVideoCreate(nullptr, 25.0), nullptr);
-
-    VideoEvenProcess stage(&source, 0.0);
-    EXPECT_EQ(stage.GetFrame(), nullptr);
-    EXPECT_EQ(stage.Forward(1), 0);
-    EXPECT_EQ(stage.Seek(1.0, 0), 0.0);
-    EXPECT_EQ(stage.GetOffset(), 0.0);
-    EXPECT_EQ(source.forwardCalls, 0);
+    for (bool gone : {false, true}) {
+        Source source(Source::Regular(25, 2), 25.0);
+        source.pictureGoneAtEnd = gone;
+        VideoEvenProcess stage(&source, 25.0);
+        EXPECT_EQ((Ints{stage.Forward(1), stage.Forward(1), stage.position}), (Ints{1, 0, 1}));
+        EXPECT_EQ(stage.GetFrame() == nullptr, gone);
+    }
 }
 
-TEST(VideoEvenStep, DoublingRateRepeatsEveryPicture)
+TEST(VideoEvenSeek, StartOffsetNearestTickAndNoPicture)
 {
-    Source source(Source::Regular(25, 20), 25.0);
-    VideoEvenProcess stage(&source, 50.0);
-    std::vector<int64_t> times;
-    EXPECT_EQ(PullIndices(stage, 6, &times), (std::vector<int>{0, 1, 1, 2, 2, 3, 3}));
-    for (size_t i = 0; i < times.size(); ++i)
-        EXPECT_EQ(times[i], static_cast<int64_t>(i) * 200000);
-    EXPECT_EQ(stage.GetFrame()->streamTime, stage.GetFrame()->startTime);
-    EXPECT_EQ(stage.GetFrame()->duration, 200000);
-    // The stage hands out a copy of the record; the planes stay the source's.
-    EXPECT_EQ(stage.GetFrame()->plane[0], source.GetFrame()->plane[0]);
-}
-
-TEST(VideoEvenStep, HalvingRateDropsEverySecondPictureAndTakesExactHits)
-{
-    Source source(Source::Regular(50, 20), 50.0);
-    VideoEvenProcess stage(&source, 25.0);
-    EXPECT_EQ(PullIndices(stage, 4), (std::vector<int>{0, 2, 4, 6, 8}));
-}
-
-TEST(VideoEvenStep, IrregularSourceAndMultiStepForward)
-{
-    Source source({0, 300000, 1000000, 1100000, 1300000, 2500000}, 25.0);
-    VideoEvenProcess stage(&source, 25.0);
-    // Three ticks at once: the first picture at or after 0.12 s.
-    EXPECT_EQ(stage.Forward(3), 3);
-    EXPECT_EQ(stage.position, 3);
-    EXPECT_EQ(Source::IndexOf(stage.GetFrame()), 4);
-    EXPECT_EQ(stage.GetFrame()->startTime, 1200000);
-    EXPECT_EQ(stage.Forward(0), 0);
-    EXPECT_EQ(stage.position, 3);
-    EXPECT_EQ(PullIndices(stage, 3), (std::vector<int>{4, 5, 5, 5}));
-}
-
-TEST(VideoEvenStep, PicturesBeforeTheStreamStartAreSkipped)
-{
-    Source source(Source::Regular(25, 10), 25.0);
-    source.info().firstTime = 800000;
-    VideoEvenProcess stage(&source, 25.0);
-    EXPECT_EQ(stage.Forward(1), 1);
-    EXPECT_EQ(Source::IndexOf(stage.GetFrame()), 3);
-}
-
-TEST(VideoEvenEnd, SourceEndingMidStepStillCompletesTheStep)
-{
-    Source source(Source::Regular(25, 3), 25.0);
-    VideoEvenProcess stage(&source, 25.0);
-    EXPECT_EQ(stage.Forward(5), 5);
-    EXPECT_EQ(stage.position, 5);
-    EXPECT_EQ(Source::IndexOf(stage.GetFrame()), 2);
-
-    EXPECT_EQ(stage.Forward(1), 0);
-    EXPECT_EQ(stage.position, 5);
-    EXPECT_EQ(Source::IndexOf(stage.GetFrame()), 2);
-}
-
-TEST(VideoEvenEnd, SourceLosingItsPictureLeavesNothingToHandOut)
-{
-    Source source(Source::Regular(25, 2), 25.0);
-    source.pictureGoneAtEnd = true;
-    VideoEvenProcess stage(&source, 25.0);
-    EXPECT_EQ(stage.Forward(1), 1);
-    EXPECT_EQ(stage.Forward(1), 0);
-    EXPECT_EQ(stage.GetFrame(), nullptr);
-    EXPECT_EQ(stage.Forward(1), 0);
-}
-
-TEST(VideoEvenSeek, RequestsAreShiftedByStartOffsetAndClampedAtZero)
-{
+    using Values = std::vector<double>;
     Source source(Source::Regular(25, 400), 25.0);
     source.info().startOffset = 20000000;
     VideoEvenProcess stage(&source, 25.0);
-
-    EXPECT_DOUBLE_EQ(stage.Seek(10.0, 7), 10.0);
-    EXPECT_DOUBLE_EQ(source.lastSeekRequest, 8.0);
-    EXPECT_EQ(source.lastSeekFlags, 7u);
-    EXPECT_EQ(stage.position, 250);
+    EXPECT_EQ((Values{stage.Seek(10.0, 7), source.lastSeekRequest, double(source.lastSeekFlags)}), (Values{10, 8, 7}));
     EXPECT_EQ(stage.GetFrame()->startTime, 100000000);
-
-    stage.Seek(-5.0, 0);
-    EXPECT_DOUBLE_EQ(source.lastSeekRequest, 0.0);
     stage.Seek(1.0, 0);
-    EXPECT_DOUBLE_EQ(source.lastSeekRequest, 0.0);
+    EXPECT_EQ(source.lastSeekRequest, 0.0);
+
+    // At 30 per second the source's 0.12 s is nearest to tick 4; the picture keeps its duration.
+    Source regular(Source::Regular(25, 100), 25.0);
+    VideoEvenProcess thirty(&regular, 30.0);
+    EXPECT_DOUBLE_EQ(thirty.Seek(0.1, 0), 0.1333333);
+    EXPECT_EQ(thirty.GetFrame()->duration, 400000);
+    EXPECT_EQ(Steps(thirty, {1}), (Ints{3, 5}));
+
+    Source empty(std::vector<int64_t>{}, 25.0);
+    VideoEvenProcess nothing(&empty, 25.0);
+    EXPECT_EQ((Values{nothing.Seek(2.0, 0), double(nothing.Forward(1))}), (Values{2, 0}));
+    EXPECT_EQ(nothing.GetFrame(), nullptr);
 }
 
-TEST(VideoEvenSeek, LandsOnTheNearestTickAndKeepsTheSourceDuration)
+TEST(VideoEvenLifecycle, RatelessSourcesAreRefusedAndCloseLeavesTheSourceOpen)
 {
-    Source source(Source::Regular(25, 100), 25.0);
-    VideoEvenProcess stage(&source, 30.0);
-    // The source lands at 0.12 s, nearest to tick 4 of 30 per second.
-    EXPECT_DOUBLE_EQ(stage.Seek(0.1, 0), 1333333 / 10000000.0);
-    EXPECT_EQ(stage.position, 4);
-    EXPECT_EQ(stage.GetFrame()->startTime, 1333333);
-    EXPECT_EQ(stage.GetFrame()->duration, 400000);
-    EXPECT_NEAR(stage.GetOffset(), 4 / 30.0, 1e-12);
+    Source rateless(Source::Regular(25, 5), 0.0);
+    EXPECT_EQ(PEVideoCreate(&rateless, 0.0), nullptr);
+    EXPECT_EQ(PEVideoCreate(nullptr, 25.0), nullptr);
+    VideoEvenProcess refused(&rateless, -3.0);
+    EXPECT_TRUE(refused.GetFrame() == nullptr && refused.Forward(1) == 0 && refused.Seek(1.0, 0) == 0.0);
 
-    EXPECT_EQ(stage.Forward(1), 1);
-    EXPECT_EQ(stage.GetFrame()->startTime, 1666667);
-}
-
-TEST(VideoEvenSeek, NoPictureAfterSeekStaysNearTheRequest)
-{
-    Source source(std::vector<int64_t>{}, 25.0);
-    VideoEvenProcess stage(&source, 25.0);
-    EXPECT_EQ(stage.GetFrame(), nullptr);
-    EXPECT_DOUBLE_EQ(stage.Seek(2.0, 0), 2.0);
-    EXPECT_EQ(stage.position, 50);
-    EXPECT_EQ(stage.GetFrame(), nullptr);
-    EXPECT_EQ(stage.Forward(1), 0);
-}
-
-TEST(VideoEvenLifecycle, OffsetCloseAndOwnership)
-{
     Source source(Source::Regular(25, 10), 25.0);
     VideoDecoder* stage = PEVideoCreate(&source, 25.0);
-    ASSERT_NE(stage, nullptr);
-    EXPECT_EQ(stage->Open(L"ignored", nullptr, nullptr), 1);
-    EXPECT_EQ(stage->SetExDecodeParam(1, 2, 3), 0);
-    stage->Forward(1);
-    stage->Forward(1);
-    EXPECT_DOUBLE_EQ(stage->GetOffset(), 0.08);
-
-    PCVideoSeek(stage, 0.2, 0);
-    EXPECT_EQ(Source::IndexOf(stage->GetFrame()), 5);
-
     stage->Close();
-    EXPECT_EQ(stage->GetStreamInfo(), nullptr);
-    EXPECT_EQ(stage->GetFrame(), nullptr);
-    EXPECT_EQ(stage->Forward(1), 0);
-    EXPECT_EQ(source.closeCalls, 0);
+    EXPECT_TRUE(stage->GetStreamInfo() == nullptr && stage->GetFrame() == nullptr && stage->Forward(1) == 0);
     PEVideoDestroy(stage);
-
-    PEVideoDestroy(nullptr);
-    PCVideoSeek(nullptr, 1.0, 0);
     EXPECT_EQ(source.closeCalls, 0);
 }
 

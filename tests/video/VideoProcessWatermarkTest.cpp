@@ -3,219 +3,178 @@
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <cstring>
 #include <string>
+#include <vector>
 
 #include "media/VideoExports.h"
+#include "support/BitmapHeader.h"
 #include "support/ScriptedVideoDecoder.h"
-#include "support/WatermarkBitmaps.h"
+#include "support/VideoFrames.h"
 
 namespace {
 
 using testing::internal::CaptureStdout;
 using testing::internal::GetCapturedStdout;
-
+using Source = ScriptedVideoDecoder;
+using Ints = std::vector<int>;
 constexpr double kNoEvenStage = -1.0;
 
-struct Stage {
-    explicit Stage(int width = 640, int height = 480)
-        : source(ScriptedVideoDecoder::Regular(25, 3), 25.0, width, height),
-          process(&source, nullptr, kNoEvenStage, false)
+// A bitmap as a host hands it in: the 40-byte header, then the pixels, in one buffer.
+struct Bitmap {
+    Bitmap(int width, int height, int bitCount) : bytes(sizeof(tagBITMAPINFOHEADER) + width * height * 4)
     {
+        const tagBITMAPINFOHEADER header = BitmapHeader(width, height, bitCount);
+        std::memcpy(bytes.data(), &header, sizeof(header));
     }
-    ScriptedVideoDecoder source;
-    VideoProcess process;
+    tagBITMAPINFO* info() { return reinterpret_cast<tagBITMAPINFO*>(bytes.data()); }
+    unsigned char* bits() { return bytes.data() + sizeof(tagBITMAPINFOHEADER); }
+    std::vector<unsigned char> bytes;
 };
 
-tagBITMAPINFO* const kMoveOnly = reinterpret_cast<tagBITMAPINFO*>(~uintptr_t{0});
-
-TEST(FixedWatermark, AlignedIsFourFifthsOfTheOutputWidthWithinItsHeight)
+// Planar: Y, V, U and alpha packed without gaps, each plane one value.
+Bitmap Planar(int width, int height, unsigned char y, unsigned char u, unsigned char v, unsigned char alpha)
 {
-    Stage stage;
-    WatermarkBitmap wide = PlanarBitmap(200, 100, 200, 90, 60, 255);
-    stage.process.SetWatermarkImageAlign(wide.info(), wide.bits(), 9, 70);
-    ASSERT_NE(stage.process.watermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.watermarkFrame->width, 512);
-    EXPECT_EQ(stage.process.watermarkFrame->height, 256);
-    EXPECT_EQ(stage.process.watermarkAlign, 9);
-    EXPECT_EQ(stage.process.watermarkLevel, 70);
-    EXPECT_EQ(stage.process.watermarkRect, nullptr);
-
-    // Too tall for the aspect: the output height cuts it.
-    WatermarkBitmap tall = PlanarBitmap(100, 200, 200, 90, 60, 255);
-    stage.process.SetWatermarkImageAlign(tall.info(), nullptr, 0, 100);
-    ASSERT_NE(stage.process.watermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.watermarkFrame->width, 512);
-    EXPECT_EQ(stage.process.watermarkFrame->height, 480);
+    Bitmap bitmap(width, height, 20);
+    const size_t luma = static_cast<size_t>(width) * height, chroma = ((width + 1) / 2) * ((height + 1) / 2);
+    const size_t sizes[] = {luma, chroma, chroma, luma};
+    const unsigned char values[] = {y, v, u, alpha};
+    for (size_t plane = 0, at = 0; plane < 4; at += sizes[plane++])
+        std::memset(bitmap.bits() + at, values[plane], sizes[plane]);
+    return bitmap;
 }
 
-TEST(FixedWatermark, PlanarPlanesKeepTheirOrderAndValues)
+Ints Size(const MEDIA_FRAME* frame)
 {
-    Stage stage;
-    WatermarkBitmap bitmap = PlanarBitmap(8, 6, 200, 90, 60, 128);
-    tagRECT rect{10, 20, 14, 24};
-    stage.process.SetWatermarkImage(bitmap.info(), bitmap.bits(), &rect, 100);
-    const MEDIA_FRAME* mark = stage.process.watermarkFrame;
-    ASSERT_NE(mark, nullptr);
-    EXPECT_EQ(mark->plane[0][5], 200);
-    EXPECT_EQ(mark->plane[1][1], 90);  // U
-    EXPECT_EQ(mark->plane[2][1], 60);  // V
-    EXPECT_EQ(mark->plane[3][15], 128);
+    return frame != nullptr ? Ints{frame->width, frame->height} : Ints{};
 }
 
-TEST(FixedWatermark, RectangleSetsTheSizeAndIsTraced)
+unsigned char Luma(const MEDIA_FRAME* frame, int x, int y)
 {
-    Stage stage;
-    WatermarkBitmap bitmap = PlanarBitmap(31, 7, 200, 90, 60, 255);
-    tagRECT rect{10, 20, 110, 70};
-    CaptureStdout();
-    stage.process.SetWatermarkImage(bitmap.info(), bitmap.bits(), &rect, 40);
-    EXPECT_EQ(GetCapturedStdout(), "\t\t (10, 20, 110, 70)\r\n");
-    ASSERT_NE(stage.process.watermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.watermarkFrame->width, 100);
-    EXPECT_EQ(stage.process.watermarkFrame->height, 50);
-    ASSERT_NE(stage.process.watermarkRect, nullptr);
-    EXPECT_NE(stage.process.watermarkRect, &rect);
-    EXPECT_EQ(stage.process.watermarkRect->right, 110);
-    EXPECT_EQ(stage.process.watermarkLevel, 40);
+    return frame->plane[0][y * frame->pitch[0] + x];
 }
 
-TEST(FixedWatermark, RefusalsLeaveNoWatermark)
+TEST(FixedWatermark, SizesPlanesAndRefusals)
 {
-    Stage stage;
-    WatermarkBitmap good = PlanarBitmap(20, 10, 200, 90, 60, 255);
-    WatermarkBitmap rgb24 = NewBitmap(20, 10, 24, 20 * 10 * 3);
-    stage.process.SetWatermarkImageAlign(good.info(), good.bits(), 3, 100);
-    ASSERT_NE(stage.process.watermarkFrame, nullptr);
-
-    CaptureStdout();
-    stage.process.SetWatermarkImageAlign(rgb24.info(), rgb24.bits(), 5, 60);
-    EXPECT_EQ(GetCapturedStdout(), "Watermark format error BitCount = 24.\r\n");
-    EXPECT_EQ(stage.process.watermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.watermarkAlign, 5);
-    EXPECT_EQ(stage.process.watermarkLevel, 60);
-
-    CaptureStdout();
-    stage.process.SetWatermarkImage(nullptr, nullptr, nullptr, 30);
-    EXPECT_EQ(GetCapturedStdout(), "Watermark format error. lpbi = 0\r\n");
-    EXPECT_EQ(stage.process.watermarkLevel, 30);
-
-    // A placement below 2 x 2 cannot be scaled into: nothing is kept.
-    tagRECT dot{5, 5, 6, 9};
-    CaptureStdout();
-    stage.process.SetWatermarkImage(good.info(), good.bits(), &dot, 100);
-    GetCapturedStdout();
-    EXPECT_EQ(stage.process.watermarkFrame, nullptr);
-
-    WatermarkBitmap empty = PlanarBitmap(4, 4, 1, 1, 1, 1);
-    empty.info()->bmiHeader.biHeight = -4;
-    CaptureStdout();
-    stage.process.SetWatermarkImageAlign(empty.info(), empty.bits(), 0, 100);
-    EXPECT_NE(GetCapturedStdout().find("Watermark format error"), std::string::npos);
-    EXPECT_EQ(stage.process.watermarkFrame, nullptr);
+    const struct {
+        int width, height, bitCount;
+        bool byRect;
+        tagRECT rect;
+        Ints size;  // empty: no watermark kept
+        std::string printed;
+    } cases[] = {
+        {200, 100, 20, false, {}, {512, 256}, ""},  // four fifths of the output width
+        {100, 200, 20, false, {}, {512, 480}, ""},  // cut by the output height
+        {31, 7, 20, true, {10, 20, 110, 70}, {100, 50}, "\t\t (10, 20, 110, 70)\r\n"},
+        {20, 10, 20, true, {5, 5, 6, 9}, {}, "\t\t (5, 5, 6, 9)\r\n"},  // below 2 x 2
+        {20, 10, 24, false, {}, {}, "Watermark format error BitCount = 24.\r\n"},
+        {4, -4, 20, false, {}, {}, "Watermark format error. Size = 4 x -4.\r\n"},
+        {0, 0, 0, true, {0, 0, 8, 8}, {}, "\t\t (0, 0, 8, 8)\r\nWatermark format error. lpbi = 0\r\n"},
+    };
+    Source source(Source::Regular(25, 2), 25.0, 640, 480);
+    VideoProcess stage(&source, nullptr, kNoEvenStage, false);
+    Bitmap earlier = Planar(8, 8, 1, 2, 3, 4);
+    for (const auto& c : cases) {
+        SCOPED_TRACE(&c - cases);
+        stage.SetWatermarkImageAlign(earlier.info(), earlier.bits(), 1, 100);
+        Bitmap bitmap = Planar(c.width, c.height < 0 ? -c.height : c.height, 200, 90, 60, 128);
+        bitmap.info()->bmiHeader.biHeight = c.height;
+        bitmap.info()->bmiHeader.biBitCount = static_cast<uint16_t>(c.bitCount);
+        tagBITMAPINFO* info = c.bitCount != 0 ? bitmap.info() : nullptr;
+        tagRECT rect = c.rect;
+        CaptureStdout();
+        if (c.byRect)
+            stage.SetWatermarkImage(info, nullptr, &rect, 40);  // the pixels follow the header
+        else
+            stage.SetWatermarkImageAlign(info, bitmap.bits(), 9, 40);
+        EXPECT_EQ(GetCapturedStdout(), c.printed);
+        EXPECT_EQ((Ints{stage.watermarkLevel, stage.watermarkAlign}), (Ints{40, c.byRect ? 1 : 9}));
+        EXPECT_EQ(Size(stage.watermarkFrame), c.size);
+        if (const MEDIA_FRAME* mark = stage.watermarkFrame) {
+            EXPECT_EQ((Ints{mark->plane[0][0], mark->plane[1][0], mark->plane[2][0], mark->plane[3][0]}),
+                      (Ints{200, 90, 60, 128}));
+            EXPECT_EQ(stage.watermarkRect != nullptr && stage.watermarkRect != &rect, c.byRect);
+        }
+    }
 }
 
-TEST(FixedWatermark, ThirtyTwoBitRowsAreReadTopDown)
+TEST(UserWatermark, PlacedByFractionsMovedResizedOnceIntoACacheAndRemoved)
 {
-    Stage stage;
-    // Memory rows 0 and 1 opaque: the top of the picture.
-    WatermarkBitmap bitmap = Bitmap32(4, 4, 2);
+    Source source(Source::Regular(25, 2), 25.0, 640, 480);
+    VideoProcess stage(&source, nullptr, kNoEvenStage, false);
+    Bitmap bitmap = Planar(64, 48, 200, 90, 60, 255);
+    tagBITMAPINFO* const moveOnly = reinterpret_cast<tagBITMAPINFO*>(~uintptr_t{0});
+    tagFRECT corner{0.75f, 0.0f, 1.0f, 0.25f}, quarter{0.5f, 0.5f, 1.0f, 1.0f}, sliver{0.0f, 0.0f, 0.5f, 0.005f};
+    stage.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &corner, 80, 0);
+    const MEDIA_FRAME* prepared = stage.userWatermarkFrame;
+    EXPECT_EQ(Size(prepared), (Ints{160, 120}));
+    stage.SetUserWatermarkImage(moveOnly, nullptr, &quarter, 100, 0);
+    EXPECT_EQ((Ints{stage.userWatermarkFrame == prepared, stage.userWatermarkLevel}), (Ints{1, 100}));
+    const MEDIA_FRAME* out = stage.GetFrame();
+    MEDIA_FRAME* cache = stage.userWatermarkCache;
+    EXPECT_EQ(Size(cache), (Ints{320, 240}));
+    EXPECT_EQ((Ints{Luma(out, 319, 239), Luma(out, 320, 240), Luma(out, 639, 479)}), (Ints{16, 200, 200}));
+    // A cache of the right size is drawn as it is; a picture of the placed size directly.
+    std::memset(cache->plane[0], 90, 320 * 240);
+    EXPECT_EQ(Luma(stage.GetFrame(), 400, 300), 90);
+    stage.SetUserWatermarkImage(bitmap.info(), reinterpret_cast<unsigned char*>(moveOnly), &corner, 100, 0);
+    EXPECT_EQ(Luma(stage.GetFrame(), 500, 10), 200);
+    EXPECT_EQ(Size(stage.userWatermarkCache), (Ints{320, 240}));
+    // Null pixels remove it; a placement of 3 rows or fewer keeps the rectangle but no picture.
+    stage.SetUserWatermarkImage(bitmap.info(), nullptr, &corner, 50, 0);
+    EXPECT_EQ((Ints{stage.userWatermarkFrame != nullptr, stage.userWatermarkRect != nullptr}), (Ints{0, 0}));
+    stage.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &sliver, 60, 0);
+    EXPECT_EQ((Ints{stage.userWatermarkFrame != nullptr, stage.userWatermarkRect != nullptr}), (Ints{0, 1}));
+    stage.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), nullptr, 60, 0);
+    EXPECT_EQ(Size(stage.userWatermarkFrame), (Ints{640, 480}));
+}
+
+TEST(Watermark, ThirtyTwoBitRowsAreTopDownUnlessTheUserFlagSaysBottomUp)
+{
+    Source source(Source::Regular(25, 2), 25.0, 64, 64);
+    VideoProcess stage(&source, nullptr, kNoEvenStage, false);
+    Bitmap bitmap(4, 4, 32);
+    std::memset(bitmap.bits(), 255, 2 * 4 * 4);  // the first two rows in memory: opaque white
     tagRECT rect{0, 0, 4, 4};
+    tagFRECT fractions{0.0f, 0.0f, 0.0625f, 0.0625f};
     CaptureStdout();
-    stage.process.SetWatermarkImage(bitmap.info(), bitmap.bits(), &rect, 100);
+    stage.SetWatermarkImage(bitmap.info(), bitmap.bits(), &rect, 100);
     GetCapturedStdout();
-    const MEDIA_FRAME* mark = stage.process.watermarkFrame;
-    ASSERT_NE(mark, nullptr);
-    EXPECT_EQ(mark->plane[3][0], 255);
-    EXPECT_EQ(mark->plane[3][15], 0);
-    EXPECT_GT(mark->plane[0][0], 230);
+    stage.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &fractions, 100, 1);
+    const MEDIA_FRAME *fixed = stage.watermarkFrame, *user = stage.userWatermarkFrame;
+    ASSERT_TRUE(fixed != nullptr && user != nullptr);
+    EXPECT_EQ((Ints{fixed->plane[3][0], fixed->plane[3][15], user->plane[3][0], user->plane[3][15]}),
+              (Ints{255, 0, 0, 255}));
+    EXPECT_GT(fixed->plane[0][0], 230);
 }
 
-TEST(UserWatermark, FractionsOfTheOutputSizeAndMoveOnlyCalls)
+TEST(WatermarkDrawing, FixedGoesOverUserCanBeHiddenAndFollowsTheCrop)
 {
-    Stage stage;
-    WatermarkBitmap bitmap = PlanarBitmap(64, 48, 200, 90, 60, 255);
-    tagFRECT corner{0.75f, 0.0f, 1.0f, 0.25f};
-    stage.process.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &corner, 80, 0);
-    const MEDIA_FRAME* prepared = stage.process.userWatermarkFrame;
-    ASSERT_NE(prepared, nullptr);
-    EXPECT_EQ(prepared->width, 160);
-    EXPECT_EQ(prepared->height, 120);
-    EXPECT_EQ(stage.process.userWatermarkLevel, 80);
-
-    tagFRECT moved{0.0f, 0.5f, 0.25f, 0.75f};
-    stage.process.SetUserWatermarkImage(kMoveOnly, nullptr, &moved, 20, 0);
-    EXPECT_EQ(stage.process.userWatermarkFrame, prepared);
-    ASSERT_NE(stage.process.userWatermarkRect, nullptr);
-    EXPECT_FLOAT_EQ(stage.process.userWatermarkRect->top, 0.5f);
-    EXPECT_EQ(stage.process.userWatermarkLevel, 20);
-
-    stage.process.SetUserWatermarkImage(bitmap.info(), nullptr, &moved, 50, 0);
-    EXPECT_EQ(stage.process.userWatermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.userWatermarkRect, nullptr);
-    EXPECT_EQ(stage.process.userWatermarkLevel, 20);
-}
-
-TEST(UserWatermark, SmallPlacementsKeepTheRectangleButNoPicture)
-{
-    Stage stage;
-    WatermarkBitmap bitmap = PlanarBitmap(16, 16, 200, 90, 60, 255);
-    tagFRECT sliver{0.0f, 0.0f, 0.5f, 0.005f};  // 320 x 2
-    stage.process.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &sliver, 60, 0);
-    EXPECT_EQ(stage.process.userWatermarkFrame, nullptr);
-    ASSERT_NE(stage.process.userWatermarkRect, nullptr);
-    EXPECT_EQ(stage.process.userWatermarkLevel, 60);
-
-    // No rectangle: the whole output.
-    stage.process.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), nullptr, 60, 0);
-    ASSERT_NE(stage.process.userWatermarkFrame, nullptr);
-    EXPECT_EQ(stage.process.userWatermarkFrame->width, 640);
-}
-
-TEST(UserWatermark, BottomUpFlagReversesThirtyTwoBitRows)
-{
-    Stage stage(64, 64);
-    WatermarkBitmap bitmap = Bitmap32(4, 4, 2);
-    tagFRECT whole{0.0f, 0.0f, 0.0625f, 0.0625f};  // 4 x 4
-    stage.process.SetUserWatermarkImage(bitmap.info(), bitmap.bits(), &whole, 100, 1);
-    const MEDIA_FRAME* mark = stage.process.userWatermarkFrame;
-    ASSERT_NE(mark, nullptr);
-    EXPECT_EQ(mark->plane[3][0], 0);
-    EXPECT_EQ(mark->plane[3][15], 255);
-}
-
-TEST(WatermarkExports, DrawDisableAndIgnoredCalls)
-{
-    ScriptedVideoDecoder source(ScriptedVideoDecoder::Regular(25, 3), 25.0, 64, 48);
-    VideoDecoder* stage = PCVideoInit(&source, nullptr, kNoEvenStage, false);
-    ASSERT_NE(stage, nullptr);
-    auto* process = static_cast<VideoProcess*>(stage);
-
-    WatermarkBitmap white = PlanarBitmap(8, 8, 235, 128, 128, 255);
-    tagRECT rect{0, 0, 8, 8};
+    Source source(Source::Regular(25, 2), 25.0, 360, 288);
+    VideoDecoder* handle = PCVideoInit(&source, nullptr, kNoEvenStage, false);
+    Bitmap gray = Planar(200, 200, 180, 128, 128, 255), white = Planar(16, 16, 235, 128, 128, 255);
+    tagFRECT quarter{0.0f, 0.0f, 0.5f, 0.5f};
+    tagRECT rect{100, 100, 116, 116};
+    PCSetUserWatermarkImage(handle, gray.info(), gray.bits(), &quarter, 100, 0);
     CaptureStdout();
-    PCSetWatermarkImage(stage, white.info(), white.bits(), &rect, 100);
+    PCSetWatermarkImage(handle, white.info(), white.bits(), &rect, 100);
     GetCapturedStdout();
-    EXPECT_EQ(stage->GetFrame()->plane[0][65], 235);
-
-    PCDisableWatermark(stage, 1);
-    EXPECT_EQ(stage->GetFrame()->plane[0][65], 16);
-    PCDisableWatermark(stage, 0);
-    EXPECT_EQ(stage->GetFrame()->plane[0][65], 235);
-
-    PCSetWatermarkSrcID(stage, nullptr, L"id", &rect, 5);
-    PCSetWatermarkSrcIDAlign(stage, nullptr, L"id", 3, 5);
-    EXPECT_EQ(process->watermarkLevel, 100);
-    EXPECT_EQ(process->watermarkAlign, 0);
-    EXPECT_NE(process->watermarkFrame, nullptr);
-
-    // Other kinds of stage and null handles are ignored.
+    PCSetWatermarkSrcIDAlign(handle, nullptr, L"id", 3, 5);  // no effect
+    EXPECT_EQ((Ints{Luma(handle->GetFrame(), 100, 100), Luma(handle->GetFrame(), 99, 99)}), (Ints{235, 180}));
+    PCDisableWatermark(handle, 1);
+    EXPECT_EQ(Luma(handle->GetFrame(), 100, 100), 180);
+    PCDisableWatermark(handle, 0);
+    // The rectangle is in uncropped output pixels: it follows the crop's corner.
+    const tagRECT crop = {40, 20, 200, 180};
+    PCSetCropRect(handle, &crop);
+    const MEDIA_FRAME* out = handle->GetFrame();
+    EXPECT_EQ((Ints{Luma(out, 60, 80), Luma(out, 75, 95), Luma(out, 59, 80), Luma(out, 100, 100)}),
+              (Ints{235, 235, 16, 16}));
+    // A handle of another kind of stage is ignored.
     VideoDecoder* even = PEVideoCreate(&source, 25.0);
     PCSetWatermarkImageAlign(even, white.info(), white.bits(), 1, 100);
-    PCSetUserWatermarkImage(nullptr, white.info(), white.bits(), nullptr, 100, 0);
-    PCSetWatermarkImage(nullptr, white.info(), white.bits(), &rect, 100);
-    EXPECT_EQ(PCCaptureImage(even, const_cast<wchar_t*>(L"x.bmp"), 0, 0), 0);
     PEVideoDestroy(even);
-    PCVideoRelease(stage);
+    PCVideoRelease(handle);
 }
 
 }  // namespace
