@@ -3,28 +3,69 @@
 
 #include <gtest/gtest.h>
 
+#include <fcntl.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
 #include <cstdint>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <memory>
+#include <sstream>
+#include <stdexcept>
 #include <string>
 #include <vector>
+
+#include "tools/avpost/ToolError.h"
 
 namespace avpost::tool::testing {
 
 // A fresh folder under the system's temporary folder, removed with everything in it.
 class TempDir {
 public:
-    TempDir();
-    ~TempDir();
+    TempDir() : path_((std::filesystem::temp_directory_path() / "avpost-test-XXXXXX").string())
+    {
+        if (mkdtemp(path_.data()) == nullptr)
+            throw std::runtime_error("cannot make a temporary folder");
+    }
+    ~TempDir()
+    {
+        std::error_code ignored;
+        std::filesystem::remove_all(path_, ignored);
+    }
     TempDir(const TempDir&) = delete;
     TempDir& operator=(const TempDir&) = delete;
 
     const std::string& path() const { return path_; }
     std::string File(const std::string& name) const { return path_ + "/" + name; }
     // Names in the folder, sorted.
-    std::vector<std::string> List() const;
+    std::vector<std::string> List() const
+    {
+        std::vector<std::string> names;
+        for (const auto& entry : std::filesystem::directory_iterator(path_))
+            names.push_back(entry.path().filename().string());
+        std::sort(names.begin(), names.end());
+        return names;
+    }
 
 private:
     std::string path_;
 };
+
+inline std::string ReadWholeFile(const std::string& path)
+{
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream bytes;
+    bytes << in.rdbuf();
+    return bytes.str();
+}
+
+inline void WriteWholeFile(const std::string& path, const std::string& bytes)
+{
+    std::ofstream(path, std::ios::binary) << bytes;
+}
 
 struct RunResult {
     int exitCode = -1;
@@ -34,37 +75,118 @@ struct RunResult {
 
 // Runs a program found on PATH (or by its path) with arguments, no shell involved; standard
 // input is empty unless stdinFile names a file to read it from.
-RunResult RunProgram(const std::vector<std::string>& command, const std::string& stdinFile = "");
+inline RunResult RunProgram(const std::vector<std::string>& command, const std::string& stdinFile = "")
+{
+    TempDir capture;
+    const pid_t child = fork();
+    if (child == 0) {
+        dup2(open(stdinFile.empty() ? "/dev/null" : stdinFile.c_str(), O_RDONLY), 0);
+        dup2(open(capture.File("out").c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600), 1);
+        dup2(open(capture.File("err").c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600), 2);
+        std::vector<char*> argv;
+        for (const std::string& word : command)
+            argv.push_back(const_cast<char*>(word.c_str()));
+        argv.push_back(nullptr);
+        execvp(argv[0], argv.data());
+        _exit(127);
+    }
+    RunResult result;
+    int status = 0;
+    if (child > 0 && waitpid(child, &status, 0) == child)
+        result.exitCode = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+    result.out = ReadWholeFile(capture.File("out"));
+    result.err = ReadWholeFile(capture.File("err"));
+    return result;
+}
 
-// True when a program is on PATH.
-bool HaveProgram(const std::string& name);
+// Values from ffprobe about a file's first stream of a type ("v" or "a"), such as
+// "width,nb_read_frames", comma-separated in ffprobe's own order (codec_name, width, height,
+// pix_fmt, r_frame_rate, nb_read_frames; sample_rate, channels, duration); empty when ffprobe
+// cannot tell.
+inline std::string Probe(const std::string& path, const std::string& streamType, const std::string& entries)
+{
+    const RunResult run = RunProgram({"ffprobe", "-v", "error", "-count_frames", "-select_streams", streamType + ":0",
+                                      "-show_entries", "stream=" + entries, "-of", "csv=p=0", path});
+    return run.exitCode == 0 ? run.out.substr(0, run.out.find('\n')) : "";
+}
 
-std::string ReadWholeFile(const std::string& path);
-void WriteWholeFile(const std::string& path, const std::string& bytes);
-bool FileExists(const std::string& path);
-
-// One value from ffprobe about a file's first stream of a type ("v" or "a"), such as
-// "width", "nb_read_frames" or "duration"; empty when ffprobe cannot tell.
-std::string Probe(const std::string& path, const std::string& streamType, const std::string& entry);
+inline double ProbeSeconds(const std::string& path, const std::string& streamType)
+{
+    return std::atof(Probe(path, streamType, "duration").c_str());
+}
 
 // value as `bytes` little-endian bytes.
-std::string LittleEndian(uint32_t value, int bytes);
+inline std::string Le(uint32_t value, int bytes)
+{
+    std::string out;
+    for (int i = 0; i < bytes; ++i)
+        out += static_cast<char>(value >> (8 * i) & 0xFF);
+    return out;
+}
+
+// The message of the ToolError that action throws; empty when it throws none.
+template <typename Action>
+std::string ToolErrorOf(Action action)
+{
+    try {
+        action();
+    } catch (const ToolError& error) {
+        return error.what();
+    }
+    return "";
+}
+
+// Expects error to name path and then give reason; an empty reason expects no error at all.
+inline void ExpectNamedError(const std::string& error, const std::string& path, const std::string& reason)
+{
+    if (reason.empty()) {
+        EXPECT_EQ(error, "");
+        return;
+    }
+    EXPECT_EQ(error.rfind(path + ": ", 0), 0u) << error;
+    EXPECT_NE(error.find(reason), std::string::npos) << reason << " -> " << error;
+}
 
 // A suite whose media files FFmpeg's command-line tool makes once, in SetUpTestSuite of the
 // derived suite through Make; every test is skipped when ffmpeg or ffprobe is missing.
 class MediaSuite : public ::testing::Test {
 protected:
     // Makes the media folder; false (and every test skipped) without FFmpeg's tools.
-    static bool StartMedia();
-    static void TearDownTestSuite();
-    void SetUp() override;
+    static bool StartMedia()
+    {
+        for (const char* program : {"ffmpeg", "ffprobe"})
+            if (RunProgram({program, "-version"}).exitCode != 0)
+                return false;
+        media_ = std::make_unique<TempDir>();
+        return true;
+    }
+    void SetUp() override
+    {
+        if (!media_)
+            GTEST_SKIP() << "FFmpeg's ffmpeg and ffprobe are not installed";
+    }
 
     static std::string Media(const std::string& name) { return media_->File(name); }
     // Runs ffmpeg quietly with these arguments, the last being the file it makes.
-    static void Make(const std::vector<std::string>& arguments);
+    static void Make(std::vector<std::string> arguments)
+    {
+        arguments.insert(arguments.begin(), {"ffmpeg", "-hide_banner", "-loglevel", "error", "-y"});
+        ASSERT_EQ(RunProgram(arguments).exitCode, 0) << "making " << arguments.back();
+    }
+    // "clip.mp4": 2 s of 320x240 pictures at 25/s with 44.1 kHz stereo AAC sound; "late-sound.mkv":
+    // 1 s of anamorphic 16:9 720x576 pictures, with 48 kHz mono PCM sound starting 0.5 s after them.
+    static void MakeContainers()
+    {
+        Make({"-f", "lavfi", "-i", "testsrc2=size=320x240:rate=25:duration=2", "-f", "lavfi", "-i",
+              "sine=frequency=440:sample_rate=44100:duration=2", "-c:v", "mpeg4", "-c:a", "aac", "-ac", "2",
+              "-shortest", Media("clip.mp4")});
+        Make({"-f", "lavfi", "-i", "testsrc2=size=720x576:rate=25:duration=1", "-itsoffset", "0.5", "-f", "lavfi",
+              "-i", "sine=sample_rate=48000:duration=1", "-aspect", "16:9", "-c:v", "mpeg4", "-c:a", "pcm_s16le",
+              Media("late-sound.mkv")});
+    }
 
 private:
-    static TempDir* media_;
+    static inline std::unique_ptr<TempDir> media_;
 };
 
 }  // namespace avpost::tool::testing
