@@ -65,7 +65,7 @@ TEST(CopyVideoFrame, CopiesRowsAcrossPitchesAndTimesOnlyWhenAsked)
 
 TEST(CopyVideoFrame, EqualPitchesCopyWholePlanesButNeverAlpha)
 {
-    FramePtr src(CreateYV12Frame(5, 5, true, false), ReleaseYV12Frame);
+    FramePtr src(CreateYV12Frame(5, 5, true, false));
     std::fill_n(src->plane[0], 25 + 2 * 9 + 25, 77);
     FramePtr dst = NewFrame(5, 5, true);
     CopyVideoFrame(dst.get(), src.get(), true);

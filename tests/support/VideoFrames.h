@@ -6,12 +6,16 @@
 
 #include "media/MediaFrame.h"
 
-// A video frame made by CreateYV12Frame (cleared to black), released with it.
-using FramePtr = std::unique_ptr<MEDIA_FRAME, void (*)(MEDIA_FRAME*)>;
+// A video frame made by CreateYV12Frame, released with it.
+struct FrameDeleter {
+    void operator()(MEDIA_FRAME* frame) const { ReleaseYV12Frame(frame); }
+};
+using FramePtr = std::unique_ptr<MEDIA_FRAME, FrameDeleter>;
 
+// A new frame cleared to black.
 inline FramePtr NewFrame(int width, int height, bool withAlpha = false)
 {
-    return FramePtr(CreateYV12Frame(width, height, withAlpha, true), ReleaseYV12Frame);
+    return FramePtr(CreateYV12Frame(width, height, withAlpha, true));
 }
 
 // A packed copy of a picture, times included.
