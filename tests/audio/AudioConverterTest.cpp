@@ -6,18 +6,15 @@
 #include <string>
 #include <vector>
 
-#include "support/AudioSamples.h"
+#include "AudioSamples.h"
 #include "support/EventLog.h"
 
 namespace {
 
-using audiosamples::Ramp;
-using audiosamples::Samples;
-
 Samples Convert(CAudioConverter& converter, const Samples& in)
 {
     converter.Put(in.data(), static_cast<int>(in.size()));
-    return audiosamples::TakeAll(converter);
+    return TakeAll(converter);
 }
 
 // The remainder is shared by every converter in the process; each test starts from zero.
@@ -26,42 +23,18 @@ protected:
     void SetUp() override { CAudioConverter::s_dSpare = 0.0; }
 };
 
-struct Case {
-    int in, out, inRate, outRate;
-    std::vector<Samples> blocks, expected;  // one expected output per block, in order
-};
-
-void Check(const Case& c)
+TEST_F(Converter, MixesByTheFixedTableAndInterpolatesAcrossBlocks)
 {
-    CAudioConverter converter(c.in, c.out, c.inRate, c.outRate, 0);
-    for (size_t i = 0; i < c.blocks.size(); ++i)
-        EXPECT_EQ(Convert(converter, c.blocks[i]), c.expected[i])
-            << c.in << " -> " << c.out << " ch, " << c.inRate << " -> " << c.outRate << " Hz, block " << i;
-}
-
-TEST_F(Converter, MixesChannelsByTheFixedTable)
-{
-    const std::pair<std::vector<int>, std::pair<Samples, Samples>> cases[] = {
-        {{1, 2}, {{1234}, {1234, 1234}}},
-        {{1, 6}, {{-5}, {-5, -5, 0, 0, 0, 0}}},
-        {{2, 1}, {{-3, -3, 32767, 32767, -32768, -32768}, {-2, 32766, -32768}}},
-        {{2, 6}, {{7, -8}, {7, -8, 0, 0, 0, 0}}},
-        {{6, 1}, {{20000, 20000, 20000, 20000, 20000, 20000, 1, 2, 3, 4, 5, 1000}, {32767, 15}}},
-        {{6, 2}, {{-20000, -20000, -20000, -20000, -20000, 0, 1, 2, 3, 4, 5, 6}, {-32767, -32767, 9, 11}}},
-        {{7, 1}, {{6, 13, -6, 7, 7, 7, 7}, {5}}},
-        {{7, 2}, {{2, 5, -5, 3, 4, 7, -7}, {0, 1}}},
-        {{8, 1}, {{7, 8, 15, 16, -9, 0, 0, 0}, {3}}},
-        {{8, 2}, {{3, 4, 7, 8, 100, -3, -5, 9}, {4, 26}}},
-        {{3, 2}, {{1, 2, 3, 4, 5, 6}, {0, 0, 0, 0, 0, 0}}},  // no rule: silence as long as the input
-        {{4, 2}, {{1, 2, 3, 4}, {0, 0, 0, 0}}},
-    };
-    for (const auto& c : cases)
-        Check(Case{c.first[0], c.first[1], 48000, 48000, {c.second.first}, {c.second.second}});
-}
-
-TEST_F(Converter, InterpolatesAcrossBlocksFromTheHistory)
-{
-    const Case cases[] = {
+    // One expected output per block, in order.
+    const struct { int in, out, inRate, outRate; std::vector<Samples> blocks, expected; } cases[] = {
+        {1, 2, 8000, 8000, {{1234}}, {{1234, 1234}}},
+        {2, 1, 8000, 8000, {{-3, -3, 32767, 32767, -32768, -32768, 9}}, {{-2, 32766, -32768}}},  // partial frame dropped
+        {2, 6, 8000, 8000, {{7, -8}}, {{7, -8, 0, 0, 0, 0}}},
+        {6, 1, 8000, 8000, {{20000, 20000, 20000, 20000, 20000, 20000, 1, 2, 3, 4, 5, 1000}}, {{32767, 15}}},
+        {6, 2, 8000, 8000, {{-20000, -20000, -20000, -20000, -20000, 0, 1, 2, 3, 4, 5, 6}}, {{-32767, -32767, 9, 11}}},
+        {7, 2, 8000, 8000, {{2, 5, -5, 3, 4, 7, -7}}, {{0, 1}}},
+        {8, 1, 8000, 8000, {{7, 8, 15, 16, -9, 0, 0, 0}}, {{3}}},
+        {3, 2, 8000, 8000, {{1, 2, 3, 4, 5, 6, 7}}, {Samples(7, 0)}},  // no rule: silence as long as the input
         // Mono: the first position lies between the history and the block.
         {1, 1, 24000, 48000, {{0, 100, 200, 300}, {400, 500, 600, 700}},
          {{0, 0, 50, 100, 150, 200, 250, 300}, {350, 400, 450, 500, 550, 600, 650, 700}}},
@@ -70,12 +43,15 @@ TEST_F(Converter, InterpolatesAcrossBlocksFromTheHistory)
         // Stereo at positions -1/3, 1/3 and 1 (in pairs); the last pair is the block's last.
         {2, 2, 32000, 48000, {{0, 1000, 300, -600}}, {{0, 666, 99, 467, 300, -600}}},
         // Six channels: each channel between whole frames, none borrowing from its neighbour.
-        {2, 6, 24000, 48000, {{100, 200, 300, 400}, {500, 600}},
-         {{50, 100, 0, 0, 0, 0, 100, 200, 0, 0, 0, 0, 200, 300, 0, 0, 0, 0, 300, 400, 0, 0, 0, 0},
-          {400, 500, 0, 0, 0, 0, 500, 600, 0, 0, 0, 0}}},
+        {2, 6, 24000, 48000, {{100, 200, 300, 400}},
+         {{50, 100, 0, 0, 0, 0, 100, 200, 0, 0, 0, 0, 200, 300, 0, 0, 0, 0, 300, 400, 0, 0, 0, 0}}},
     };
-    for (const Case& c : cases)
-        Check(c);
+    for (const auto& c : cases) {
+        CAudioConverter converter(c.in, c.out, c.inRate, c.outRate, 0);
+        for (size_t i = 0; i < c.blocks.size(); ++i)
+            EXPECT_EQ(Convert(converter, c.blocks[i]), c.expected[i])
+                << c.in << " -> " << c.out << " ch, " << c.inRate << " -> " << c.outRate << " Hz, block " << i;
+    }
 }
 
 TEST_F(Converter, CarriesTheRemainderSoCountsFollowTheRateRatio)
@@ -90,79 +66,61 @@ TEST_F(Converter, CarriesTheRemainderSoCountsFollowTheRateRatio)
     EXPECT_EQ(Convert(halving, block).size(), 2206u);
     EXPECT_EQ(CAudioConverter::s_dSpare, 0.0);
 
-    CAudioConverter up(2, 2, 44100, 48000, 0);
+    CAudioConverter up(2, 2, 44100, 48000, 0), same(2, 2, 44100, 44100, 0);
     long total = 0;
     for (int i = 0; i < 100; ++i)
         total += static_cast<long>(Convert(up, block).size());
     EXPECT_LE(std::labs(total - 480000), 2);
+    const double spare = CAudioConverter::s_dSpare;
+    EXPECT_EQ(Convert(same, block), block);
+    EXPECT_EQ(CAudioConverter::s_dSpare, spare);  // a plain copy leaves the remainder alone
 }
 
-TEST_F(Converter, EqualFormatsCopyWithoutTouchingHistoryOrRemainder)
+TEST_F(Converter, GrowsBeforeAnyBlockCouldOverrunKeepingWhatItHolds)
 {
-    CAudioConverter converter(2, 2, 44100, 44100, 0);
-    converter.scratch[1] = 22;
-    CAudioConverter::s_dSpare = 0.25;
-    EXPECT_EQ(Convert(converter, Ramp(6, -3)), Ramp(6, -3));
-    EXPECT_EQ(converter.scratch[1], 22);
-    EXPECT_EQ(CAudioConverter::s_dSpare, 0.25);
-}
-
-TEST_F(Converter, GrowsBeforeAnyBlockCouldOverrun)
-{
-    EXPECT_EQ(CAudioConverter(1, 1, 8000, 8000, 0).capacity, 262144);
     CAudioConverter converter(1, 1, 8000, 8000, 100);
-    converter.Put(Ramp(10, 1).data(), 10);
-    // Estimate 2 * 50 + 64 = 164 exceeds the 90 free samples: grow by 2 * 164 + 4096.
-    EXPECT_EQ(converter.Put(Ramp(50, 1).data(), 50), 60);
+    const Samples ramp = Ramp(60, 1);
+    converter.Put(ramp.data(), 10);
+    EXPECT_EQ(converter.Put(ramp.data() + 10, 50), 60);  // 2 * 50 + 64 > 90 free: grows by 2 * 164 + 4096
     EXPECT_EQ(converter.capacity, 4524);
-    Samples expected = Ramp(10, 1), second = Ramp(50, 1);
-    expected.insert(expected.end(), second.begin(), second.end());
-    EXPECT_EQ(audiosamples::TakeAll(converter), expected);
-
+    EXPECT_EQ(TakeAll(converter), ramp);
     // The output estimate (264) fits; the 4800-sample block does not fit the scratch buffer.
     CAudioConverter reducing(1, 1, 48000, 1000, 1000);
     EXPECT_EQ(Convert(reducing, Samples(4800, 1200)), Samples(100, 1200));
-
     // A remainder left by another converter can ask for no output, or for more than estimated.
     CAudioConverter other(1, 1, 1000, 6000, 16);
     CAudioConverter::s_dSpare = -10.0;
-    EXPECT_EQ(other.Put(Ramp(1, 1).data(), 1), 0);
-    EXPECT_EQ(CAudioConverter::s_dSpare, -9.0);
+    EXPECT_EQ(other.Put(ramp.data(), 1), 0);
     CAudioConverter::s_dSpare = 100.0;
-    EXPECT_EQ(other.Put(Ramp(2, 1).data(), 2), 612);
+    EXPECT_EQ(other.Put(ramp.data(), 2), 612);
 }
 
-TEST_F(Converter, GetTakesFromTheFrontAndResetEmpties)
+TEST_F(Converter, GetTakesFromTheFrontAtMostWhatIsValid)
 {
     CAudioConverter converter(1, 1, 8000, 8000, 0);
-    converter.Put(Ramp(10, 1).data(), 10);
-    Samples out(20, -1);
-    EXPECT_EQ(converter.Get(out.data(), 4), 4);
-    EXPECT_EQ(converter.Get(out.data(), 20), 6);
-    EXPECT_EQ(Samples(out.begin(), out.begin() + 7), (Samples{4, 5, 6, 7, 8, 9, -1}));
-    converter.Put(out.data(), 10);
-    converter.Reset();
-    EXPECT_EQ(converter.Get(out.data(), 20), 0);
-    EXPECT_EQ(converter.Put(out.data(), 0), 0);
-    EXPECT_EQ(CAudioConverter(1, 1, 0, 48000, 0).Put(out.data(), 10), 0);  // no input rate
+    converter.Put(Ramp(6, 1).data(), 6);
+    Samples out(8, -1);
+    EXPECT_EQ(converter.Get(out.data(), 2), 2);
+    EXPECT_EQ(converter.Get(out.data(), 8), 4);
+    EXPECT_EQ(out, (Samples{2, 3, 4, 5, -1, -1, -1, -1}));
+    EXPECT_EQ(CAudioConverter(1, 1, 0, 48000, 0).Put(out.data(), 8), 0);  // no input rate: nothing
 }
 
 TEST_F(Converter, ChangeInputEmptiesTheFifoAndSaysSo)
 {
-    ASSERT_TRUE(eventlog::Loaded());
-    eventlog::Clear();
+    std::vector<std::wstring>* log = ClearedEventLog();
+    ASSERT_NE(log, nullptr);
     CAudioConverter converter(2, 2, 44100, 48000, 0);
     converter.Put(Ramp(100, 1).data(), 100);
     testing::internal::CaptureStdout();
     converter.ChangeInput(2, 44100);
     EXPECT_NE(converter.GetValidSize(), 0);
     converter.ChangeInput(1, 22050);
+    EXPECT_EQ(converter.GetValidSize(), 0);
     EXPECT_EQ(testing::internal::GetCapturedStdout(), " *** CAudioConverter::ChangeInput 2 => 1 channels.\r\n"
                                                       " *** CAudioConverter::ChangeInput 44100 => 22050 Hz.\r\n");
-    EXPECT_EQ(converter.GetValidSize(), 0);
-    EXPECT_EQ(converter.inputRate, 22050);
-    EXPECT_EQ(eventlog::Messages(), (std::vector<std::wstring>{L" *** CAudioConverter::ChangeInput 2 => 1 channels.",
-                                                                L" *** CAudioConverter::ChangeInput 44100 => 22050 Hz."}));
+    ASSERT_EQ(log->size(), 2u);
+    EXPECT_EQ(log->back(), L" *** CAudioConverter::ChangeInput 44100 => 22050 Hz.");
 }
 
 }  // namespace

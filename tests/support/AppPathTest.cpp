@@ -6,73 +6,41 @@
 #include <cstdlib>
 #include <cstring>
 #include <string>
-#include <vector>
 
 #include "support/BundleUrl.h"
 
 namespace {
 
-TEST(ReplaceStr2Char, ReplacesEveryOccurrenceAndClosesUp)
+TEST(AppPath, ExecutableDirectoryWithoutSlashOrNothingWhenItDoesNotFit)
 {
-    const struct {
-        const char* text;
-        const char* pattern;
-        const char* expected;
-        int count;
-    } cases[] = {
-        {"a%20b%20", "%20", "a b ", 2}, {"no pattern", "%20", "no pattern", 0}, {"%2%20", "%20", "%2 ", 1},
-        {"aaaaa", "aa", "  a", 2},  // matches do not overlap
-        {"", "%20", "", 0},       {"abc", "", "abc", 0},  {"abc", nullptr, "abc", 0},
-    };
-    for (const auto& c : cases) {
-        std::vector<char> text(c.text, c.text + std::strlen(c.text) + 1);
-        text.push_back('#');  // guard
-        EXPECT_EQ(replace_str_2_char(text.data(), c.pattern, ' '), c.count) << c.text;
-        EXPECT_STREQ(text.data(), c.expected) << c.text;
-        EXPECT_EQ(text.back(), '#');
-    }
-    EXPECT_EQ(replace_str_2_char(nullptr, "a", ' '), 0);
+    char path[600], resolved[2][PATH_MAX];
+    std::memset(path, 0x5A, sizeof path);
+    GetAppPathA(path, 0);  // no usable size: 512 bytes
+    const std::string full(path);
+    ASSERT_GT(full.size(), 1u);
+    EXPECT_NE(full.back(), '/');
+    EXPECT_STREQ(realpath(path, resolved[0]), realpath(AVPOST_TEST_EXECUTABLE_DIR, resolved[1]));
+    EXPECT_EQ(path[full.size() + 1], 0x5A);
+    GetAppPathA(path, static_cast<int>(full.size()));
+    EXPECT_STREQ(path, "");
+    GetAppPathA(path, static_cast<int>(full.size()) + 1);
+    EXPECT_EQ(path, full);
 }
 
-TEST(BundleUrl, TurnsBundleAndDirectoryUrlsIntoExecutableDirectories)
+TEST(AppPath, BundleUrlsBecomeExecutableDirectories)
 {
     const std::pair<const char*, const char*> cases[] = {
         {"file://localhost/Applications/My%20Tool.app/", "/Applications/My Tool.app/Contents/MacOS"},
-        {"file://localhost/Users/me/Tools/", "/Users/me/Tools"},
-        {"/opt/My%20Dir/", "/opt/My Dir"},  // no scheme: only the escape and the slash change
-        {"file://localhost/a%2520b/", "/a%2520b"},
+        {"file://localhost/a%2520b/", "/a%2520b"},  // one pass: no escape is decoded twice
+        {"/opt/My%20Dir/", "/opt/My Dir"},          // no scheme: only the escape and the slash change
         {"", ""},
-        {"file://localhost/too/long/", ""},  // does not fit the 8 bytes below
+        {"file://localhost/too/lon/", ""},          // 8 characters do not fit the 8 bytes below
     };
     for (const auto& c : cases) {
-        char path[512];
-        avpost::detail::AppPathFromBundleUrl(c.first, path, std::strlen(c.second) > 0 ? sizeof(path) : 8);
+        char path[64];
+        avpost::detail::AppPathFromBundleUrl(c.first, path, c.second[0] != '\0' ? sizeof path : 8);
         EXPECT_STREQ(path, c.second) << c.first;
     }
-}
-
-std::string Resolved(const char* path)
-{
-    char resolved[PATH_MAX];
-    return realpath(path, resolved) != nullptr ? std::string(resolved) : std::string();
-}
-
-TEST(GetAppPathA, GivesTheExecutableDirectoryOrNothingWhenItDoesNotFit)
-{
-    char path[600];
-    std::memset(path, 0x5A, sizeof(path));
-    GetAppPathA(path, 0);  // no usable size: the full 512 bytes are available
-    const size_t length = std::strlen(path);
-    ASSERT_GT(length, 1u);
-    EXPECT_NE(path[length - 1], '/');
-    EXPECT_EQ(Resolved(path), Resolved(AVPOST_TEST_EXECUTABLE_DIR));
-    EXPECT_EQ(path[length + 1], 0x5A);
-
-    const std::string full(path);
-    GetAppPathA(path, static_cast<int>(length));
-    EXPECT_STREQ(path, "");
-    GetAppPathA(path, static_cast<int>(length) + 1);
-    EXPECT_EQ(full, path);
 }
 
 }  // namespace

@@ -2,59 +2,43 @@
 #define AVPOST_TESTS_SUPPORT_SCRIPTEDAUDIODECODER_H
 
 #include <cstdint>
-#include <cstring>
+#include <utility>
 #include <vector>
 
 #include "media/Decoder.h"
 #include "media/MediaFrame.h"
 
-// An audio source that plays a fixed list of blocks, each with its own time stamp, bytes and
-// duration, then reports the end of data. Seek moves to the first block stamped at or after the
-// requested time and reports that time as reached.
+// An audio source that plays a fixed list of stamped blocks, then reports the end of data. Seek
+// moves to the first block stamped at or after the requested time and reports that time (or
+// seekReaches when set) as reached.
 class ScriptedAudioDecoder : public AudioDecoder {
 public:
-    struct Block {
-        int64_t time = 0;  // startTime and streamTime, 100 ns units
-        std::vector<unsigned char> bytes;
-        int32_t duration = 0;
-    };
+    using Bytes = std::vector<unsigned char>;
 
-    ScriptedAudioDecoder(int rate, int channels, int bits)
+    ScriptedAudioDecoder(int rate, int channels, int bits) : info()
     {
-        std::memset(&info_, 0, sizeof(info_));
-        info_.audio.sampleRate = rate;
-        info_.audio.channels = channels;
-        info_.audio.bitsPerSample = bits;
-        info_.audio.bytesPerSecond = rate * channels * bits / 8;
+        info.audio = {rate, channels, bits, rate * channels * bits / 8, 0.0, 0};
     }
-
-    // size bytes counting up from first (mod 256), so tests can tell which bytes they got.
-    static std::vector<unsigned char> Counting(int size, int first = 0)
+    static Bytes Samples(const std::vector<int16_t>& samples)
     {
-        std::vector<unsigned char> bytes(static_cast<size_t>(size));
-        for (int i = 0; i < size; ++i)
-            bytes[static_cast<size_t>(i)] = static_cast<unsigned char>(first + i);
-        return bytes;
+        const auto* first = reinterpret_cast<const unsigned char*>(samples.data());
+        return Bytes(first, first + 2 * samples.size());
     }
-
-    // 16-bit samples as the bytes of a block.
-    static std::vector<unsigned char> Samples(const std::vector<int16_t>& samples)
-    {
-        std::vector<unsigned char> bytes(samples.size() * 2);
-        if (!samples.empty())
-            std::memcpy(bytes.data(), samples.data(), bytes.size());
-        return bytes;
-    }
-
     // The time of `frames` sample frames into the stream, rounded to 100 ns.
-    int64_t TimeOf(int64_t frames) const
+    int64_t TimeOf(int64_t frames) const { return (frames * 20000000 / info.audio.sampleRate + 1) / 2; }
+    // Adds a block stamped time (startTime and streamTime); add every block before the first pull.
+    void Add(int64_t time, Bytes bytes, int32_t duration = 0)
     {
-        return (frames * 10000000 * 2 / info_.audio.sampleRate + 1) / 2;
-    }
-
-    void Add(int64_t time, std::vector<unsigned char> bytes, int32_t duration = 0)
-    {
-        blocks_.push_back(Block{time, std::move(bytes), duration});
+        MEDIA_FRAME block = MEDIA_FRAME();
+        block.type = 3;
+        block.param1 = info.audio.sampleRate;
+        block.param2 = info.audio.channels;
+        block.bitsPerSample = info.audio.bitsPerSample;
+        block.data = bytes.data();  // a moved vector keeps its buffer
+        block.dataSize = static_cast<int32_t>(bytes.size());
+        block.startTime = block.streamTime = time;
+        block.duration = duration;
+        blocks.emplace_back(block, std::move(bytes));
     }
 
     void Close() override { ++closeCalls; }
@@ -62,46 +46,22 @@ public:
     double Seek(double seconds) override
     {
         seekRequests.push_back(seconds);
-        const auto target = static_cast<int64_t>(seconds * 10000000.0 + 0.5) + info_.firstTime;
-        next_ = 0;
-        while (next_ < blocks_.size() && blocks_[next_].time < target)
-            ++next_;
+        const int64_t target = static_cast<int64_t>(seconds * 10000000.0 + 0.5) + info.firstTime;
+        for (next = 0; next < blocks.size() && blocks[next].first.startTime < target;)
+            ++next;
         return seekReaches >= 0.0 ? seekReaches : seconds;
     }
-    MEDIA_FRAME* GetNextFrame() override
-    {
-        ++pulls;
-        if (next_ >= blocks_.size())
-            return nullptr;
-        Block& block = blocks_[next_++];
-        frame_ = MEDIA_FRAME();
-        frame_.type = 3;
-        frame_.param1 = info_.audio.sampleRate;
-        frame_.param2 = info_.audio.channels;
-        frame_.bitsPerSample = info_.audio.bitsPerSample;
-        frame_.data = block.bytes.data();
-        frame_.dataSize = static_cast<int32_t>(block.bytes.size());
-        frame_.bufferSize = frame_.dataSize;
-        frame_.startTime = frame_.streamTime = block.time;
-        frame_.duration = block.duration;
-        return &frame_;
-    }
+    // Hands out the scripted frame itself, so a stage that writes into it shows in blocks.
+    MEDIA_FRAME* GetNextFrame() override { return next < blocks.size() ? &blocks[next++].first : nullptr; }
     double GetOffset() const override { return 0.25; }
-    const STREAM_INFO* GetStreamInfo() const override { return &info_; }
+    const STREAM_INFO* GetStreamInfo() const override { return &info; }
 
-    STREAM_INFO& info() { return info_; }
-    MEDIA_FRAME* lastFrame() { return &frame_; }
-
-    int pulls = 0;
+    STREAM_INFO info;
+    std::vector<std::pair<MEDIA_FRAME, Bytes>> blocks;
+    size_t next = 0;  // the block handed out next
     int closeCalls = 0;
     std::vector<double> seekRequests;
-    double seekReaches = -1.0;  // what Seek reports; negative: the time asked for
-
-private:
-    std::vector<Block> blocks_;
-    STREAM_INFO info_;
-    MEDIA_FRAME frame_ = MEDIA_FRAME();
-    size_t next_ = 0;
+    double seekReaches = -1.0;
 };
 
 #endif
