@@ -79,7 +79,7 @@ TEST(Tallies, AudioGapsAndOverlapsAreMeasuredOnTheConsumersTimeLine)
 {
     // Starts 10 ms late (a gap from 0), then a 5 ms gap, a 4 ms overlap, and a block wholly in the past.
     ScriptedAudioDecoder source(48000, 2, 16);
-    source.info().firstTime = 5000000;
+    source.info.firstTime = 5000000;
     const std::pair<int, int> blocks[] = {{10, 20}, {35, 10}, {41, 10}, {0, 8}};  // start, length in ms
     for (const auto& [start, length] : blocks)
         source.Add(start * kMillisecond + 5000000, {}, static_cast<int32_t>(length * kMillisecond));
@@ -91,7 +91,7 @@ TEST(Tallies, AudioGapsAndOverlapsAreMeasuredOnTheConsumersTimeLine)
     EXPECT_NEAR(tally.received(), 0.048, 1e-9);
 
     ScriptedAudioDecoder shifted(48000, 2, 16);
-    shifted.info().startOffset = 20 * kMillisecond;  // begins 20 ms into the consumer's time line
+    shifted.info.startOffset = 20 * kMillisecond;  // begins 20 ms into the consumer's time line
     shifted.Add(0, {}, static_cast<int32_t>(10 * kMillisecond));
     AudioTally late(shifted);
     late.GetNextFrame();
