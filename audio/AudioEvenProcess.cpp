@@ -14,8 +14,7 @@ int32_t AudioEvenProcess::cnt = 0;
 
 namespace {
 
-constexpr double kUnitsPerSecond = 10000000.0;
-constexpr int32_t kTypePcm = 3;
+using avpost::kUnitsPerSecond;
 constexpr int32_t kFillerPiece = 2048;
 constexpr int32_t kAlwaysLoggedDrop = 512;  // smaller dropped blocks are logged one in a hundred
 constexpr int32_t kDropLogInterval = 100;
@@ -49,7 +48,7 @@ AudioEvenProcess::AudioEvenProcess(AudioDecoder* decoder)
     : source(decoder), lastSampleFrame(), frameSize(0), frame(), pending(nullptr), offset(0.0), bytesOut(0),
       fillerLeft(0)
 {
-    frame.type = kTypePcm;
+    frame.type = avpost::kFrameTypePcm;
     const STREAM_INFO* info = source != nullptr ? source->GetStreamInfo() : nullptr;
     if (info == nullptr)
         return;

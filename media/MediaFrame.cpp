@@ -7,8 +7,8 @@
 
 namespace {
 
-constexpr int32_t kTypeYV12 = 2;
-constexpr int32_t kTypePcm = 3;
+using avpost::kFrameTypePcm;
+using avpost::kFrameTypeYV12;
 constexpr size_t kSpareBytes = 512;
 constexpr unsigned char kBlackLuma = 16;
 constexpr unsigned char kNeutralChroma = 128;
@@ -66,7 +66,7 @@ MEDIA_FRAME* CreateYV12Frame(int width, int height, bool withAlpha, bool clear)
         blockSize = CheckedSum(blockSize, lumaSize);
     blockSize = CheckedSum(blockSize, kSpareBytes);
 
-    MEDIA_FRAME* frame = NewFrameRecord(kTypeYV12);
+    MEDIA_FRAME* frame = NewFrameRecord(kFrameTypeYV12);
     try {
         frame->plane[0] = new unsigned char[blockSize];
     } catch (...) {
@@ -121,7 +121,7 @@ void CopyVideoFrame(MEDIA_FRAME* dst, const MEDIA_FRAME* src, bool copyTimes)
 MEDIA_FRAME* CreateAudioFrame(int sampleRate, int channels, int bitsPerSample, int bufferSize)
 {
     const size_t capacity = bufferSize > 0 ? static_cast<size_t>(bufferSize) : 0;
-    MEDIA_FRAME* frame = NewFrameRecord(kTypePcm);
+    MEDIA_FRAME* frame = NewFrameRecord(kFrameTypePcm);
     try {
         frame->data = new unsigned char[capacity]();
     } catch (...) {

@@ -47,6 +47,14 @@ static_assert(offsetof(MEDIA_FRAME, reserved) == 48 && offsetof(MEDIA_FRAME, sta
 static_assert(offsetof(MEDIA_FRAME, streamTime) == 64 && offsetof(MEDIA_FRAME, duration) == 72, "MEDIA_FRAME layout");
 #endif
 
+namespace avpost {
+// The values of MEDIA_FRAME::type.
+constexpr int32_t kFrameTypeYV12 = 2;
+constexpr int32_t kFrameTypePcm = 3;
+// Time fields count 100-nanosecond units.
+constexpr double kUnitsPerSecond = 10000000.0;
+}  // namespace avpost
+
 // A new video frame owning one block: Y, V, U, the alpha plane when asked for, then 512 spare
 // bytes. With clear, Y is black (16), chroma neutral (128) and alpha opaque (255).
 AVPOST_API MEDIA_FRAME* CreateYV12Frame(int width, int height, bool withAlpha, bool clear);

@@ -9,7 +9,7 @@ using avpost::detail::TruncSaturate;
 
 namespace {
 
-constexpr double kUnitsPerSecond = 10000000.0;
+using avpost::kUnitsPerSecond;
 constexpr double kSmallestRate = 0.001;
 constexpr double kHighestRate = 200.0;
 constexpr double kFallbackRate = 30.0;

@@ -5,6 +5,7 @@
 #include <cstring>
 #include <string>
 
+#include "media/MediaFrame.h"
 #include "tools/avpost/DemoTimeline.h"
 #include "tools/avpost/PixelFont.h"
 
@@ -33,7 +34,7 @@ constexpr double kPi = 3.14159265358979323846;
 
 int BoxLeft(int64_t time)
 {
-    const double seconds = static_cast<double>(time) / 10000000.0;
+    const double seconds = static_cast<double>(time) / kUnitsPerSecond;
     const double swing = 0.5 + 0.5 * std::sin(2.0 * kPi * 0.4 * seconds);
     return 40 + static_cast<int>(swing * (kDemoWidth - kBoxSize - 80));
 }
@@ -79,7 +80,7 @@ void DrawChroma(MEDIA_FRAME& frame, int boxLeft)
 void DrawCaption(MEDIA_FRAME& frame, int64_t time, int index)
 {
     char line[64];
-    std::snprintf(line, sizeof(line), "PICTURE %03d  T %.3f", index, static_cast<double>(time) / 10000000.0);
+    std::snprintf(line, sizeof(line), "PICTURE %03d  T %.3f", index, static_cast<double>(time) / kUnitsPerSecond);
     const auto plot = [&](int x, int y) {
         if (x >= 0 && x < kDemoWidth && y >= 0 && y < kDemoHeight)
             frame.plane[0][static_cast<size_t>(y) * frame.pitch[0] + x] = kWhite;
@@ -102,7 +103,7 @@ void DrawDemoPicture(MEDIA_FRAME& frame, int64_t time, int index)
             FillRow(luma, left, left + kBoxSize, kWhite);
         }
         if (y >= kFlashTop && y < kFlashTop + kBoxSize) {
-            const bool lit = DemoFlashOn(static_cast<double>(fieldTime) / 10000000.0);
+            const bool lit = DemoFlashOn(static_cast<double>(fieldTime) / kUnitsPerSecond);
             FillRow(luma, kFlashLeft, kFlashLeft + kBoxSize, lit ? kWhite : kCaptionLuma + 20);
         }
     }

@@ -2,11 +2,13 @@
 
 #include <cmath>
 
+#include "media/MediaFrame.h"
+
 namespace avpost::tool {
 namespace {
 
 constexpr int64_t kUnitsPerMillisecond = 10000;
-constexpr int64_t kEndUnits = static_cast<int64_t>(kDemoSeconds * 10000000.0);
+constexpr int64_t kEndUnits = static_cast<int64_t>(kDemoSeconds * kUnitsPerSecond);
 constexpr int64_t kEndFrame = static_cast<int64_t>(kDemoSeconds * kDemoSampleRate);
 constexpr double kFlashSeconds = 0.1;
 constexpr double kPi = 3.14159265358979323846;

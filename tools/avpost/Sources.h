@@ -12,8 +12,6 @@
 
 namespace avpost::tool {
 
-constexpr double kUnitsPerSecond = 10000000.0;
-
 // What the tool needs from its decoders beyond the source interfaces: why a decoder stopped
 // (the interfaces only say that it did) and how long the input is, for the progress line.
 class SourceStatus {

@@ -16,7 +16,7 @@ double AudioTally::Seek(double seconds)
 {
     const double reached = source_.Seek(seconds);
     const STREAM_INFO* info = source_.GetStreamInfo();
-    end_ = static_cast<int64_t>(reached * 10000000.0) + (info != nullptr ? int64_t{info->startOffset} : 0);
+    end_ = static_cast<int64_t>(reached * kUnitsPerSecond) + (info != nullptr ? int64_t{info->startOffset} : 0);
     return reached;
 }
 

@@ -4,6 +4,7 @@
 #include <cstdint>
 
 #include "media/Decoder.h"
+#include "media/MediaFrame.h"
 
 namespace avpost::tool {
 
@@ -61,7 +62,7 @@ public:
     double overlaps() const { return Seconds(overlaps_); }
 
 private:
-    static double Seconds(int64_t units) { return static_cast<double>(units) / 10000000.0; }
+    static double Seconds(int64_t units) { return static_cast<double>(units) / kUnitsPerSecond; }
 
     AudioDecoder& source_;
     int64_t end_ = 0;  // furthest point of the consumer's time line covered so far, 100 ns units
