@@ -130,8 +130,9 @@ Span VisibleSpan(int64_t position, int markLength, int frameLength)
     return first < end ? Span{static_cast<int>(first), static_cast<int>(end)} : Span{0, 0};
 }
 
-// The watermark's last row is left out. Chroma rows are placed from (y + 1) / 2 and follow
-// watermark rows and columns that are even relative to the watermark.
+// The watermark's last row is left out. Luma divides each product on its own, chroma divides
+// once. Chroma rows are placed from (y + 1) / 2 and follow watermark rows and columns that are
+// even relative to the watermark.
 void BlendAligned(const PackedPicture& dst, const Watermark& mark, Position at, int level)
 {
     const PackedPicture& src = mark.picture;
@@ -150,8 +151,8 @@ void BlendAligned(const PackedPicture& dst, const Watermark& mark, Position at, 
             if (chromaInside && c % 2 == 0) {
                 const ptrdiff_t dstChroma = chromaRow * dst.chromaWidth + dstCol / 2;
                 const ptrdiff_t srcChroma = static_cast<ptrdiff_t>(r / 2) * src.chromaWidth + c / 2;
-                dst.u[dstChroma] = BlendTwice(dst.u[dstChroma], src.u[srcChroma], a);
-                dst.v[dstChroma] = BlendTwice(dst.v[dstChroma], src.v[srcChroma], a);
+                dst.u[dstChroma] = BlendOnce(dst.u[dstChroma], src.u[srcChroma], a);
+                dst.v[dstChroma] = BlendOnce(dst.v[dstChroma], src.v[srcChroma], a);
             }
         }
     }

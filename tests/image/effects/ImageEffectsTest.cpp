@@ -180,11 +180,11 @@ GuardedPicture Gradient(int width, int height)
 TEST(AddWaterMark, LevelsAlphaAndTheTwoRoundings)
 {
     // Level, watermark alpha, frame and watermark sample, and the result through a rectangle (one
-    // division) and by alignment (two divisions).
-    const int cases[][6] = {
-        {100, 255, 100, 200, 200, 200}, {0, 255, 100, 200, 100, 100}, {100, 0, 100, 200, 100, 100},
-        {50, 255, 100, 200, 149, 149},  {50, 255, 1, 1, 1, 0},         {150, 255, 100, 200, 200, 200},
-        {-20, 255, 100, 200, 100, 100}};
+    // division for every plane), and by alignment: luma (two divisions) and chroma (one).
+    const int cases[][7] = {
+        {100, 255, 100, 200, 200, 200, 200}, {0, 255, 100, 200, 100, 100, 100}, {100, 0, 100, 200, 100, 100, 100},
+        {50, 255, 100, 200, 149, 149, 149},  {50, 255, 1, 1, 1, 0, 1},           {45, 255, 99, 201, 144, 143, 144},
+        {150, 255, 100, 200, 200, 200, 200}, {-20, 255, 100, 200, 100, 100, 100}};
     const tagRECT whole{0, 0, 4, 4};
     for (const auto& c : cases) {
         GuardedPicture mark(4, 4, true);  // Y, U and alpha
@@ -192,8 +192,9 @@ TEST(AddWaterMark, LevelsAlphaAndTheTwoRoundings)
             mark.SetPlane(plane, Samples(plane == 1 ? 4 : 16, plane == 3 ? c[1] : c[3]));
         const std::vector<Samples> frame = {Samples(16, c[2]), Samples(4, c[2]), Samples(4, 128)};
         const auto once = After([&](MEDIA_FRAME* f) { AddWaterMark(f, mark.frame(), &whole, c[0], 0); }, 4, frame);
-        const auto twice = After([&](MEDIA_FRAME* f) { AddWaterMark(f, mark.frame(), nullptr, c[0], 1); }, 4, frame);
-        EXPECT_EQ(std::tuple(once[0][5], once[1][3], twice[0][5], twice[1][3]), std::tuple(c[4], c[4], c[5], c[5]))
+        const auto aligned = After([&](MEDIA_FRAME* f) { AddWaterMark(f, mark.frame(), nullptr, c[0], 1); }, 4, frame);
+        EXPECT_EQ(std::tuple(once[0][5], once[1][3], aligned[0][5], aligned[1][0]),
+                  std::tuple(c[4], c[4], c[5], c[6]))
             << "level " << c[0] << ", under " << c[2];
     }
 }
