@@ -25,15 +25,17 @@ void CopyGreyPixel(unsigned char* dstRow, int32_t dstColumn, const unsigned char
 }
 
 // Entry k of a nearest table: first + (k x srcSpan + dstSpan / 2) / dstSpan, rounding to the
-// nearest source index; the last entry is the source's last index. Strong enlargements would
-// round past the source rectangle, so entries stay inside it.
-std::vector<int32_t> NearestIndexTable(int32_t first, int32_t srcSpan, int32_t dstSpan)
+// nearest source index; the last entry is the source's last index. When enlarging, the rounding
+// can land one index past the source rectangle: that read stays, unless it would leave the
+// picture (pictureSpan indices), where the picture's last index is read instead.
+std::vector<int32_t> NearestIndexTable(int32_t first, int32_t srcSpan, int32_t dstSpan, int32_t pictureSpan)
 {
     const int32_t last = first + srcSpan - 1;
+    const int64_t limit = std::max<int64_t>(last, int64_t{pictureSpan} - 1);
     std::vector<int32_t> table(static_cast<size_t>(dstSpan));
     for (int32_t k = 0; k < dstSpan - 1; ++k) {
         const int64_t offset = (static_cast<int64_t>(k) * srcSpan + dstSpan / 2) / dstSpan;
-        table[k] = static_cast<int32_t>(std::min<int64_t>(first + offset, last));
+        table[k] = static_cast<int32_t>(std::min<int64_t>(first + offset, limit));
     }
     table[dstSpan - 1] = last;
     return table;
@@ -85,8 +87,8 @@ int DIB_ResizeNear8(const IMG_PARAM& src, IMG_PARAM& dst)
 {
     if (!CanTabulate(src, dst))
         return 0;
-    const std::vector<int32_t> columns = NearestIndexTable(src.x, src.cx, dst.cx);
-    const std::vector<int32_t> rows = NearestIndexTable(src.y, src.cy, dst.cy);
+    const std::vector<int32_t> columns = NearestIndexTable(src.x, src.cx, dst.cx, src.nWidth);
+    const std::vector<int32_t> rows = NearestIndexTable(src.y, src.cy, dst.cy, src.nHeight);
     for (int32_t j = 0; j < dst.cy; ++j) {
         const unsigned char* in = TopDownRow(src, rows[j]);
         unsigned char* out = TopDownRow(dst, dst.y + j) + dst.x;

@@ -176,8 +176,14 @@ TEST(PlaneResize, WorkedCases)
         // Nearest 8-bit rounds: 5 columns into 3 take 0, (5 + 1) / 3 = 2 and the last.
         {Via<ImageResize8, INTERPOLATION_NEAREST>, 6, 4, kRamp, {0, 2, 5, 2}, 3, 2, {0, 0, 3, 2},
          {20, 22, 255, 30, 32, 255}},
-        // Five-fold, column 8 would round onto column 2, outside the rectangle.
-        {DIB_ResizeNear8, 6, 4, kRamp, {0, 0, 2, 1}, 10, 1, {0, 0, 10, 1}, {0, 0, 0, 1, 1, 1, 1, 1, 1, 1}},
+        // Five-fold: column 8 rounds onto column 2, one past the rectangle but inside the picture,
+        // and reads it; the last column is the rectangle's own.
+        {DIB_ResizeNear8, 6, 4, kRamp, {0, 0, 2, 1}, 10, 1, {0, 0, 10, 1}, {0, 0, 0, 1, 1, 1, 1, 1, 2, 1}},
+        // Four-fold from the single row 1: row 2 rounds onto the next picture row.
+        {DIB_ResizeNear8, 6, 4, kRamp, {1, 1, 1, 1}, 1, 4, {0, 0, 1, 4}, {11, 11, 21, 11}},
+        // At the picture's right edge, column 8 would round past the picture: its last column
+        // stands in.
+        {DIB_ResizeNear8, 3, 1, {7, 8, 9}, {1, 0, 2, 1}, 10, 1, {0, 0, 10, 1}, {8, 8, 8, 9, 9, 9, 9, 9, 9, 9}},
         // Step 12288: (0 + 3 + 30 + 34) >> 2; the last column pairs column 3 with itself; the last
         // row copies source row 3 at columns 0 and 3.
         {DIB_ResizeBiLinerY_Simulate, 6, 4, kRamp, {0, 0, 4, 4}, 2, 2, {0, 0, 2, 2}, {16, 18, 30, 34}},
