@@ -54,8 +54,6 @@ void VideoEvenProcess::Close()
 {
     delete streamInfo;
     streamInfo = nullptr;
-    // The source's picture may not outlive a close; hand out nothing from here on.
-    current = nullptr;
 }
 
 int VideoEvenProcess::Open(const wchar_t*, const DecParam*, int*)
