@@ -1,15 +1,25 @@
 #!/usr/bin/env bash
 # Installs the Debian packages the build and the tests need; does nothing when all are there.
-# Usage: scripts/install-deps.sh [--i386]   (--i386: also libjpeg for the 32-bit test build)
+# Usage: scripts/install-deps.sh [--i386] [--bench]
+#   --i386: also libjpeg for the 32-bit test build
+#   --bench: also the libraries the side-by-side benchmark compares with (libyuv, libjpeg-turbo)
 set -euo pipefail
 
 with_i386=false
-[ "${1:-}" = "--i386" ] && with_i386=true
+with_bench=false
+for arg in "$@"; do
+  case "$arg" in
+    --i386) with_i386=true ;;
+    --bench) with_bench=true ;;
+    *) echo "usage: $0 [--i386] [--bench]" >&2; exit 2 ;;
+  esac
+done
 
 packages=(cmake ninja-build g++ g++-multilib pkg-config googletest libgtest-dev libbenchmark-dev
           libjpeg62-turbo-dev
           # The command-line tool reads media files through FFmpeg's libraries; its tests use ffmpeg.
           libavformat-dev libavcodec-dev libswscale-dev libswresample-dev libavutil-dev ffmpeg)
+$with_bench && packages+=(libyuv-dev libturbojpeg0-dev)
 # libjpeg for the 32-bit build, from Debian's i386 architecture. Without it the 32-bit build
 # still passes: it skips the JPEG decoding tests and does not build IJL15.DLL.
 i386_packages=()
