@@ -5,6 +5,7 @@
 #include <limits>
 #include <new>
 
+#include "audio/VolumeInPlace.h"
 #include "media/Truncate.h"
 
 using avpost::detail::Low32;
@@ -225,7 +226,7 @@ MEDIA_FRAME* AudioProcess::ApplyVolume(MEDIA_FRAME* frame, int32_t bytesPerSampl
         return frame;
     // Sample counts are bytes / bytes per sample, never more samples than the bytes hold.
     if (frame->bitsPerSample != 8)
-        ChangeVolume16(reinterpret_cast<short*>(frame->data), size / std::max(bytesPerSample, 2), level);
+        avpost::detail::ChangeVolume16At(frame->data, size / std::max(bytesPerSample, 2), level);
     else
         ChangeVolume8(frame->data, size / std::max(bytesPerSample, 1), level);
     return frame;

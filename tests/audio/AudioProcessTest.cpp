@@ -38,6 +38,24 @@ TEST(AudioVolume, ScalesTowardZeroAndClampsInPlace)
     EXPECT_EQ(SamplesOf(&source.blocks[0].first), (Samples{16383, -1}));
 }
 
+TEST(AudioVolume, HandedThroughBlocksMayStartAtAnOddByte)
+{
+    // A 24-bit block whose data starts one byte into its buffer: dataSize / 3 16-bit samples are
+    // scaled where they lie, read and written without assuming alignment (the sanitizer build
+    // checks that).
+    Source source(48000, 1, 24);
+    source.Add(0, Source::Samples({0x1234, 0x0100, 0x7FFE, -2000, 0x5A5}));
+    MEDIA_FRAME& block = source.blocks[0].first;
+    block.data += 1;
+    block.dataSize = 6;
+    AudioProcess stage(&source, 0, 1, 24, 0);
+    stage.volume = 50;
+    ASSERT_EQ(stage.GetNextFrame(), &block);
+    // Bytes 1-2 hold 0x0012 and bytes 3-4 0xFE01 (-511), little-endian: halved toward zero, 9 and
+    // -255 (0xFF01); the bytes around them stay.
+    EXPECT_EQ(source.blocks[0].second, (Source::Bytes{0x34, 0x09, 0x00, 0x01, 0xFF, 0x7F, 0x30, 0xF8, 0xA5, 0x05}));
+}
+
 // The remainder is shared by every converter in the process; each test starts from zero.
 class AudioGathering : public testing::Test {
 protected:
