@@ -13,13 +13,15 @@
 #include "AudioEvenProcess.h"
 #include "Volume.h"
 
-namespace avpost::detail {
+namespace avpost {
+namespace detail {
 
 struct AudioFrameRelease {
     void operator()(MEDIA_FRAME* frame) const { ReleaseAudioFrame(frame); }
 };
 
-}  // namespace avpost::detail
+}  // namespace detail
+}  // namespace avpost
 
 // The audio stage over a host's decoder. Per block it can convert interleaved 16-bit PCM to a
 // sample rate and channel count fixed at construction (through a CAudioConverter created on the

@@ -18,9 +18,11 @@ struct MEDIA_FRAME {
     int32_t param2;  // video: 2; audio: channel count
     // The same words seen as plane pointers (video) or as the sample buffer (audio).
     // Each audio word is pointer-aligned so the two views share their slots on every target.
+    // Anonymous structs are an extension every x86 compiler accepts; __extension__ keeps hosts
+    // that build with -Wpedantic silent.
     union {
         unsigned char* plane[4];  // Y, U (Cb), V (Cr), alpha or null
-        struct {
+        __extension__ struct {
             alignas(void*) int32_t bitsPerSample;
             unsigned char* data;               // interleaved samples
             alignas(void*) int32_t dataSize;   // valid bytes in data
