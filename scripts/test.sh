@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Builds and tests the library four ways: x86-64, 32-bit x86 (-m32), x86-64 with
 # AddressSanitizer and UndefinedBehaviorSanitizer, and the tests labelled "threads" under
-# ThreadSanitizer. Exits non-zero on the first failure.
+# ThreadSanitizer; then runs every fuzz target briefly over its kept corpus (clang's libFuzzer).
+# Exits non-zero on the first failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -32,4 +33,5 @@ build_target=avpost_thread_tests test_label=threads \
   variant tsan -DCMAKE_BUILD_TYPE=Debug -DAVPOST_BUILD_BENCHMARKS=OFF \
   -DCMAKE_CXX_FLAGS="${tsan}" -DCMAKE_C_FLAGS="${tsan}" \
   -DCMAKE_EXE_LINKER_FLAGS="${tsan}" -DCMAKE_SHARED_LINKER_FLAGS="${tsan}"
+AVPOST_BUILD_ROOT="${build_root}" scripts/fuzz.sh --all "${AVPOST_FUZZ_SECONDS:-8}"
 echo "All builds passed."
