@@ -45,47 +45,33 @@ std::string ToneSource(int channels, const std::string& layout)
     return "aevalsrc=" + expression + ":channel_layout=" + layout + ":sample_rate=48000:duration=0.2";
 }
 
-struct Sound {
-    WavFormat format;
-    std::vector<int16_t> samples;
-};
-
-Sound ReadSound(const std::string& path)
+// Which test tones each channel of a WAV file carries: per channel one letter per tone, x heard
+// or . not, channels separated by spaces ("x.x. .xx."). The file's channel mask goes to mask.
+std::string TonesHeard(const std::string& path, int tones, uint32_t* mask = nullptr)
 {
     const std::string bytes = ReadWholeFile(path);
     MemoryBytes input(bytes.data(), bytes.size(), path);
     WavReader reader(input);
-    Sound sound{reader.format(), {}};
-    std::vector<unsigned char> buffer(65536);
-    while (const size_t got = reader.Read(buffer.data(), buffer.size()))
-        for (size_t i = 0; i + 1 < got; i += 2)
-            sound.samples.push_back(static_cast<int16_t>(buffer[i] | buffer[i + 1] << 8));
-    return sound;
-}
-
-// The amplitude of a sine of the given frequency in one channel.
-double ToneAmplitude(const Sound& sound, int channel, int frequency)
-{
-    double re = 0.0;
-    double im = 0.0;
-    const size_t channels = static_cast<size_t>(sound.format.channels);
-    const size_t frames = sound.samples.size() / channels;
-    for (size_t k = 0; k < frames; ++k) {
-        const double phase = 2.0 * M_PI * frequency * static_cast<double>(k) / sound.format.sampleRate;
-        re += sound.samples[k * channels + static_cast<size_t>(channel)] * std::cos(phase);
-        im += sound.samples[k * channels + static_cast<size_t>(channel)] * std::sin(phase);
-    }
-    return 2.0 * std::hypot(re, im) / static_cast<double>(frames);
-}
-
-// Which of the test tones a channel carries, as a string of one letter per tone: x heard, . not.
-std::string TonesHeard(const Sound& sound, int channel, int tones)
-{
+    const WavFormat format = reader.format();
+    std::vector<int16_t> samples(1 << 18);
+    const size_t frames = reader.Read(reinterpret_cast<unsigned char*>(samples.data()), samples.size() * 2) /
+                          static_cast<size_t>(format.BytesPerFrame());
+    if (mask != nullptr)
+        *mask = format.channelMask;
     std::string heard;
-    for (int t = 0; t < tones; ++t) {
-        const double amplitude = ToneAmplitude(sound, channel, kToneFrequencies[t]);
-        EXPECT_TRUE(amplitude < 30.0 || amplitude > 500.0) << "tone " << t << " half heard: " << amplitude;
-        heard += amplitude > 500.0 ? 'x' : '.';
+    for (int channel = 0; channel < format.channels; ++channel) {
+        heard += channel ? " " : "";
+        for (int tone = 0; tone < tones; ++tone) {
+            double re = 0.0, im = 0.0;  // the tone's part of the channel
+            for (size_t k = 0; k < frames; ++k) {
+                const double phase = 2.0 * M_PI * kToneFrequencies[tone] * static_cast<double>(k) / format.sampleRate;
+                re += samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::cos(phase);
+                im += samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::sin(phase);
+            }
+            const double amplitude = 2.0 * std::hypot(re, im) / static_cast<double>(frames);
+            EXPECT_TRUE(amplitude < 30.0 || amplitude > 500.0) << "tone " << tone << " half heard: " << amplitude;
+            heard += amplitude > 500.0 ? 'x' : '.';
+        }
     }
     return heard;
 }
@@ -164,20 +150,16 @@ TEST_F(EverydayMedia, FivePointOneKeepsEveryToneOnItsSide)
         const RunResult run = Avpost({"audio", Media(input), out_.File("stereo.wav"), "--channels", "2"});
         ASSERT_EQ(run.exitCode, 0) << run.err;
         EXPECT_EQ(run.err.find("downmixed"), std::string::npos) << run.err;  // the stage mixes 5.1 itself
-        const Sound stereo = ReadSound(out_.File("stereo.wav"));
-        EXPECT_EQ(TonesHeard(stereo, 0, 6) + " " + TonesHeard(stereo, 1, 6), "x.x.x. .xx..x") << input;
-
+        EXPECT_EQ(TonesHeard(out_.File("stereo.wav"), 6), "x.x.x. .xx..x") << input;
         ASSERT_EQ(Avpost({"audio", Media(input), out_.File("mono.wav"), "--channels", "1"}).exitCode, 0);
-        EXPECT_EQ(TonesHeard(ReadSound(out_.File("mono.wav")), 0, 6), "xxx.xx") << input;
+        EXPECT_EQ(TonesHeard(out_.File("mono.wav"), 6), "xxx.xx") << input;
     }
     // Passed through and spread from stereo, six channels say they are 5.1.
     ASSERT_EQ(Avpost({"audio", Media("five-one.wav"), out_.File("same.wav")}).exitCode, 0);
     ASSERT_EQ(Avpost({"audio", Media("stereo.wav"), out_.File("six.wav"), "--channels", "6"}).exitCode, 0);
     for (const char* name : {"same.wav", "six.wav"})
         EXPECT_EQ(Probe(out_.File(name), "a", "channels,channel_layout"), "6,5.1") << name;
-    const Sound six = ReadSound(out_.File("six.wav"));
-    EXPECT_EQ(six.format.channelMask, kFivePointOne);
-    EXPECT_EQ(TonesHeard(six, 0, 2) + TonesHeard(six, 1, 2) + TonesHeard(six, 2, 2), "x..x..");
+    EXPECT_EQ(TonesHeard(out_.File("six.wav"), 2), "x. .x .. .. .. ..");
 }
 
 TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
@@ -187,13 +169,12 @@ TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
     ASSERT_EQ(run.exitCode, 0) << run.err;
     EXPECT_EQ(run.err, "avpost: " + Media("seven-one.wav") + ": 7.1 sound downmixed to stereo through libswresample\n");
     // FL FR FC LFE BL BR SL SR.
-    const Sound stereo = ReadSound(out_.File("stereo.wav"));
-    EXPECT_EQ(TonesHeard(stereo, 0, 8) + " " + TonesHeard(stereo, 1, 8), "x.x.x.x. .xx..x.x");
-
+    EXPECT_EQ(TonesHeard(out_.File("stereo.wav"), 8), "x.x.x.x. .xx..x.x");
     ASSERT_EQ(Avpost({"audio", Media("seven-one.wav"), out_.File("six.wav"), "--channels", "6", "-q"}).exitCode, 0);
-    const Sound six = ReadSound(out_.File("six.wav"));
-    EXPECT_EQ(six.format.channelMask, kFivePointOne);
-    EXPECT_EQ(TonesHeard(six, 4, 8) + " " + TonesHeard(six, 5, 8), "....x.x. .....x.x");  // back and side together
+    uint32_t mask = 0;
+    const std::string six = TonesHeard(out_.File("six.wav"), 8, &mask);
+    EXPECT_EQ(six.substr(4 * 9), "....x.x. .....x.x");  // back and side together on the surrounds
+    EXPECT_EQ(mask, kFivePointOne);
 #else
     EXPECT_EQ(run.exitCode, 1);
     EXPECT_EQ(run.err, "avpost: --channels: mixing 7.1 into stereo needs FFmpeg's libswresample, and this avpost "
@@ -301,11 +282,9 @@ TEST_F(EverydayMedia, TheWatermarkFollowsOneRuleAtEveryPlaceAndUnderACrop)
         std::vector<std::string> options;
         int x, y;  // top-left corner of the white mark in the output
     } cases[] = {
-        {{}, 74, 2},
-        {{"--watermark-pos", "top-right"}, 74, 2},
+        {{}, 74, 2},  // top right, as --watermark-pos top-right
         {{"--watermark-pos", "bottom-left"}, 2, 52},
-        {{"--watermark-pos", "center"}, 38, 27},
-        {{"--crop", "60:40:30:20", "--watermark-pos", "top-right"}, 39, 1},  // 60 / 40 = 1
+        {{"--crop", "60:40:30:20"}, 39, 1},  // 60 / 40 = 1
     };
     for (const auto& c : cases) {
         SCOPED_TRACE(c.options.empty() ? "default" : c.options.back());
@@ -322,42 +301,28 @@ TEST_F(EverydayMedia, TheWatermarkFollowsOneRuleAtEveryPlaceAndUnderACrop)
                                                  '\xEB'));
         EXPECT_EQ(white, 200);
         EXPECT_EQ(luma.compare(0, static_cast<size_t>(c.y * width), plain, 0, static_cast<size_t>(c.y * width)), 0);
-        EXPECT_EQ(luma[(c.y + 5) * width + c.x - 1], plain[(c.y + 5) * width + c.x - 1]);
     }
 }
 
-TEST_F(EverydayMedia, OutputsTellTheInputsFieldsAndChromaAndDevicesAreWritten)
+TEST_F(EverydayMedia, OutputsTellTheInputsFieldsAndChromaUnlessDeinterlaced)
 {
     const std::string picture(64 * 32 + 2 * 32 * 16, '\x80');
-    testing::WriteWholeFile(out_.File("fields.y4m"),
-                            "YUV4MPEG2 W64 H32 F25:1 It A1:1 C420paldv\nFRAME\n" + picture + "FRAME\n" + picture);
-    RunResult run = Avpost({"video", out_.File("fields.y4m"), "-"});
-    ASSERT_EQ(run.exitCode, 0) << run.err;
-    EXPECT_EQ(run.out.substr(0, run.out.find('\n')), "YUV4MPEG2 W64 H32 F25:1 It A1:1 C420paldv");
-    run = Avpost({"video", out_.File("fields.y4m"), "-", "--deinterlace", "even"});
-    EXPECT_EQ(run.out.substr(0, run.out.find('\n')), "YUV4MPEG2 W64 H32 F25:1 Ip A1:1 C420paldv");
-
-    for (const std::vector<std::string>& args : {std::vector<std::string>{"video", Media("clip.y4m"), "/dev/null"},
-                                                 std::vector<std::string>{"audio", Media("stereo.wav"), "/dev/null"}}) {
-        run = Avpost(args);
-        EXPECT_EQ(run.exitCode, 0) << run.err;
+    testing::WriteWholeFile(out_.File("fields.y4m"), "YUV4MPEG2 W64 H32 F25:1 It A1:1 C420paldv\nFRAME\n" + picture);
+    for (const char* style : {"none", "even"}) {
+        const RunResult run = Avpost({"video", out_.File("fields.y4m"), "-", "--deinterlace", style});
+        EXPECT_EQ(run.out.substr(0, run.out.find('\n')),
+                  std::string("YUV4MPEG2 W64 H32 F25:1 I") + (style[0] == 'n' ? 't' : 'p') + " A1:1 C420paldv");
     }
-    run = Avpost({});
-    EXPECT_EQ(run.exitCode, 2);
-    EXPECT_EQ(run.err.rfind("usage: avpost demo", 0), 0u) << run.err;
-    EXPECT_LT(std::count(run.err.begin(), run.err.end(), '\n'), 6);
-    EXPECT_EQ(run.out, "");
 }
 
-// Starts avpost reading standard input from a pipe that the test feeds, so that the run is
-// still going when the test sends its signal.
+// avpost reading standard input from a pipe that the test feeds, so that the run is still
+// going when the test sends its signal.
 class FedRun {
 public:
     explicit FedRun(const std::vector<std::string>& arguments)
     {
         int fds[2];
-        if (pipe(fds) != 0)
-            throw std::runtime_error("pipe");
+        EXPECT_EQ(pipe(fds), 0);
         child_ = fork();
         if (child_ == 0) {
             dup2(fds[0], 0);
@@ -368,41 +333,26 @@ public:
         close(fds[0]);
         feed_ = fds[1];
     }
-    ~FedRun()
-    {
-        close(feed_);
-        if (child_ > 0 && !waited_)
-            Wait();
-    }
+    ~FedRun() { close(feed_); }
     FedRun(const FedRun&) = delete;
     FedRun& operator=(const FedRun&) = delete;
-    void Feed(const std::string& bytes) { ASSERT_EQ(write(feed_, bytes.data(), bytes.size()), ssize_t(bytes.size())); }
-    // Sends the signal until the run ends (a signal that comes between two reads is noticed
-    // at the next one; the second interrupts it), and returns the exit status.
+
+    void Feed(const std::string& bytes) { EXPECT_EQ(write(feed_, bytes.data(), bytes.size()), ssize_t(bytes.size())); }
+    // Sends the signal until the run ends (one that comes between two reads is noticed at the
+    // next; the next signal interrupts that read), and returns the exit status.
     int Interrupt(int signal)
     {
         int status = 0;
-        pid_t ended = 0;
-        for (int tries = 0; tries < 50 && (ended = waitpid(child_, &status, WNOHANG)) == 0; ++tries) {
+        for (int tries = 0; tries < 50 && waitpid(child_, &status, WNOHANG) == 0; ++tries) {
             kill(child_, signal);
             std::this_thread::sleep_for(std::chrono::milliseconds(100));
         }
-        if (ended != child_)
-            waitpid(child_, &status, 0);
-        waited_ = true;
         return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-    }
-    void Wait()
-    {
-        int status = 0;
-        waitpid(child_, &status, 0);
-        waited_ = true;
     }
 
 private:
     pid_t child_ = -1;
     int feed_ = -1;
-    bool waited_ = false;
 };
 
 // Waits until a file other than those named appears in the folder (the staged output).

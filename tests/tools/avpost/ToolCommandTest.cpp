@@ -5,9 +5,11 @@
 #include <cstdio>
 #include <filesystem>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "ToolTestSupport.h"
+#include "tools/avpost/cli/Help.h"
 
 namespace avpost::tool {
 namespace {
@@ -150,6 +152,8 @@ TEST_F(ToolRuns, EachRunEndsWithOneLineAndAnExitCodeKeepingExistingOutputs)
          "--crop: 400:100:0:0 reaches outside the 352x288 input"},
         {{"video", Media("clip.y4m"), keep, "--watermark", notes}, 1, notes + ": not a"},
         {{"video", Media("clip.y4m"), keep, "--fps", "fast"}, 2, "--fps: expected a rate"},
+        {{"video", Media("clip.y4m"), "/dev/null", "-q"}, 0, ""},  // devices are written, whatever their name
+        {{"audio", Media("tone.wav"), "/dev/null", "-q"}, 0, ""},
         {{"--help"}, 0, "avpost: "},
         {{"video", "--help"}, 0, "avpost video INPUT"},
         {{"--version"}, 0, "avpost "},
@@ -163,6 +167,8 @@ TEST_F(ToolRuns, EachRunEndsWithOneLineAndAnExitCodeKeepingExistingOutputs)
     }
     EXPECT_EQ(ReadWholeFile(keep), "precious");
     EXPECT_EQ(out_.List(), (std::vector<std::string>{"cut.y4m", "keep.y4m", "notes.txt"}));
+    const RunResult usage = Avpost({});
+    EXPECT_EQ(std::tie(usage.exitCode, usage.out, usage.err), std::make_tuple(2, "", ShortUsage()));
 }
 
 TEST_F(ToolRuns, DemoWritesItsFourFilesAndSaysWhatHappened)

@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <tuple>
-#include <vector>
 
 namespace avpost::tool {
 namespace {
@@ -40,13 +39,11 @@ TEST(ChannelPlans, TheStageMixesWhatItHasARuleForAndFfmpegDownmixesTheRest)
     }
 }
 
-TEST(ChannelPlans, FivePointOneReachesTheStageAsLeftRightSurroundsCentreLowFrequency)
+TEST(ChannelPlans, LayoutsAreNamedAsPeopleSayThem)
 {
-    // Stored in the order of the speaker bits: FL FR FC LFE BL BR, or FL FR FC LFE SL SR.
-    EXPECT_EQ(StageOrderOfFivePointOne({6, kFivePointOne}), (std::vector<int>{0, 1, 4, 5, 2, 3}));
-    EXPECT_EQ(StageOrderOfFivePointOne({6, kFivePointOneSide}), (std::vector<int>{0, 1, 4, 5, 2, 3}));
-    EXPECT_EQ(LayoutName({1, kMono}) + LayoutName({6, kFivePointOneSide}) + LayoutName({1, 0}) + LayoutName({3, 7}),
-              "mono5.11 channel3 channels");
+    EXPECT_EQ(LayoutName({1, kMono}) + "/" + LayoutName({6, kFivePointOneSide}) + "/" + LayoutName({1, 0}) + "/" +
+                  LayoutName({3, 7}),
+              "mono/5.1/1 channel/3 channels");
 }
 
 }  // namespace
