@@ -13,7 +13,7 @@
 #include <csignal>
 #include <cstdint>
 #include <cstring>
-#include <stdexcept>
+#include <filesystem>
 #include <string>
 #include <thread>
 #include <tuple>
@@ -76,18 +76,17 @@ std::string TonesHeard(const std::string& path, int tones, uint32_t* mask = null
     return heard;
 }
 
-// The pictures of a Y4M file: its header line and each picture's planes.
+// The pictures of a Y4M file.
 struct Pictures {
-    std::string header;
     Y4mFormat format;
-    std::vector<std::string> frames;  // Y, U, V planes without padding
+    std::vector<std::string> frames;  // each as a frame of CreateYV12Frame holds it: Y, then chroma
 };
 
 Pictures ReadPictures(const std::string& bytes)
 {
     MemoryBytes input(bytes.data(), bytes.size(), "output");
     Y4mReader reader(input);
-    Pictures pictures{bytes.substr(0, bytes.find('\n')), reader.format(), {}};
+    Pictures pictures{reader.format(), {}};
     VideoFramePtr frame(CreateYV12Frame(pictures.format.width, pictures.format.height, false, false));
     while (reader.ReadPicture(*frame)) {
         const MEDIA_FRAME& f = *frame;
@@ -98,37 +97,59 @@ Pictures ReadPictures(const std::string& bytes)
 
 class EverydayMedia : public testing::MediaSuite {
 protected:
-    static void SetUpTestSuite()
+    static void SetUpTestSuite() { StartMedia(); }
+
+    // An input, made on first use (each test runs in a process of its own and needs few).
+    static std::string Input(const std::string& name)
     {
-        if (!StartMedia())
-            return;
-        Make({"-f", "lavfi", "-i", ToneSource(6, "5.1"), Media("five-one.wav")});
-        Make({"-f", "lavfi", "-i", ToneSource(8, "7.1"), Media("seven-one.wav")});
-        Make({"-f", "lavfi", "-i", ToneSource(2, "stereo"), Media("stereo.wav")});
-        // White 4:3 and 3:2 pictures; the 4:3 one with a grey band over its top eighth.
-        Make({"-f", "lavfi", "-i", "color=c=white:s=640x480:r=25:d=0.08,drawbox=y=0:h=60:c=gray:t=fill", "-pix_fmt",
-              "yuv420p", Media("four-three.y4m")});
-        Make({"-f", "lavfi", "-i", "color=c=white:s=480x320:r=25:d=0.08", "-pix_fmt", "yuv420p", Media("three-two.y4m")});
-        Make({"-f", "lavfi", "-i", "testsrc2=s=96x64:r=25:d=0.12", "-pix_fmt", "yuv420p", Media("clip.y4m")});
-#ifdef AVPOST_TOOL_HAVE_FFMPEG
-        Make({"-i", Media("five-one.wav"), "-c:a", "flac", Media("five-one.mkv")});
-        // Stored 320x180 with a display matrix that turns it to portrait, as phones record.
-        Make({"-f", "lavfi", "-i", "testsrc2=s=320x180:r=25:d=0.2", "-c:v", "mpeg4", "-q:v", "2",
-              Media("landscape.mp4")});
-        Make({"-i", Media("landscape.mp4"), "-c", "copy", "-metadata:s:v:0", "rotate=90", Media("portrait.mp4")});
-#endif
+        if (!std::filesystem::exists(Media(name))) {
+            std::vector<std::string> recipe = Recipe(name);
+            recipe.push_back(Media(name));
+            Make(recipe);
+        }
+        return Media(name);
     }
 
-    static RunResult Avpost(std::vector<std::string> arguments, const std::string& stdinFile = "")
+    static std::vector<std::string> Recipe(const std::string& name)
+    {
+        const std::vector<std::string> source{"-f", "lavfi", "-i"};
+        const auto lavfi = [&](const std::string& graph, std::vector<std::string> more = {}) {
+            std::vector<std::string> arguments = source;
+            arguments.push_back(graph);
+            arguments.insert(arguments.end(), more.begin(), more.end());
+            return arguments;
+        };
+        if (name == "five-one.wav")
+            return lavfi(ToneSource(6, "5.1"));
+        if (name == "seven-one.wav")
+            return lavfi(ToneSource(8, "7.1"));
+        if (name == "stereo.wav")
+            return lavfi(ToneSource(2, "stereo"));
+        if (name == "five-one.mkv")
+            return {"-i", Input("five-one.wav"), "-c:a", "flac"};
+        // White 4:3 and 3:2 pictures; the 4:3 one with a grey band over its top eighth.
+        if (name == "four-three.y4m")
+            return lavfi("color=c=white:s=640x480:r=25:d=0.08,drawbox=y=0:h=60:c=gray:t=fill", {"-pix_fmt", "yuv420p"});
+        if (name == "three-two.y4m")
+            return lavfi("color=c=white:s=480x320:r=25:d=0.08", {"-pix_fmt", "yuv420p"});
+        if (name == "clip.y4m")
+            return lavfi("testsrc2=s=96x64:r=25:d=0.12", {"-pix_fmt", "yuv420p"});
+        if (name == "landscape.mp4")
+            return lavfi("testsrc2=s=320x180:r=25:d=0.2", {"-c:v", "mpeg4", "-q:v", "2"});
+        // Stored 320x180 with a display matrix that turns it to portrait, as phones record.
+        return {"-i", Input("landscape.mp4"), "-c", "copy", "-metadata:s:v:0", "rotate=90"};
+    }
+
+    static RunResult Avpost(std::vector<std::string> arguments)
     {
         arguments.insert(arguments.begin(), AVPOST_TOOL_PATH);
-        return testing::RunProgram(arguments, stdinFile);
+        return testing::RunProgram(arguments);
     }
 
     // Runs avpost and returns its output file's pictures.
     Pictures VideoOf(const std::vector<std::string>& options, const std::string& input)
     {
-        std::vector<std::string> arguments{"video", Media(input), out_.File("out.y4m"), "--quiet"};
+        std::vector<std::string> arguments{"video", Input(input), out_.File("out.y4m"), "--quiet"};
         arguments.insert(arguments.end(), options.begin(), options.end());
         const RunResult run = Avpost(arguments);
         EXPECT_EQ(run.exitCode, 0) << run.err;
@@ -147,16 +168,16 @@ TEST_F(EverydayMedia, FivePointOneKeepsEveryToneOnItsSide)
     // Tones of FL FR FC LFE BL BR: the left side hears FL, FC and BL; the right FR, FC and BR;
     // the stage's table leaves the low-frequency channel out.
     for (const std::string& input : inputs) {
-        const RunResult run = Avpost({"audio", Media(input), out_.File("stereo.wav"), "--channels", "2"});
+        const RunResult run = Avpost({"audio", Input(input), out_.File("stereo.wav"), "--channels", "2"});
         ASSERT_EQ(run.exitCode, 0) << run.err;
         EXPECT_EQ(run.err.find("downmixed"), std::string::npos) << run.err;  // the stage mixes 5.1 itself
         EXPECT_EQ(TonesHeard(out_.File("stereo.wav"), 6), "x.x.x. .xx..x") << input;
-        ASSERT_EQ(Avpost({"audio", Media(input), out_.File("mono.wav"), "--channels", "1"}).exitCode, 0);
+        ASSERT_EQ(Avpost({"audio", Input(input), out_.File("mono.wav"), "--channels", "1"}).exitCode, 0);
         EXPECT_EQ(TonesHeard(out_.File("mono.wav"), 6), "xxx.xx") << input;
     }
     // Passed through and spread from stereo, six channels say they are 5.1.
-    ASSERT_EQ(Avpost({"audio", Media("five-one.wav"), out_.File("same.wav")}).exitCode, 0);
-    ASSERT_EQ(Avpost({"audio", Media("stereo.wav"), out_.File("six.wav"), "--channels", "6"}).exitCode, 0);
+    ASSERT_EQ(Avpost({"audio", Input("five-one.wav"), out_.File("same.wav")}).exitCode, 0);
+    ASSERT_EQ(Avpost({"audio", Input("stereo.wav"), out_.File("six.wav"), "--channels", "6"}).exitCode, 0);
     for (const char* name : {"same.wav", "six.wav"})
         EXPECT_EQ(Probe(out_.File(name), "a", "channels,channel_layout"), "6,5.1") << name;
     EXPECT_EQ(TonesHeard(out_.File("six.wav"), 2), "x. .x .. .. .. ..");
@@ -164,13 +185,13 @@ TEST_F(EverydayMedia, FivePointOneKeepsEveryToneOnItsSide)
 
 TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
 {
-    const RunResult run = Avpost({"audio", Media("seven-one.wav"), out_.File("stereo.wav"), "--channels", "2", "-q"});
+    const RunResult run = Avpost({"audio", Input("seven-one.wav"), out_.File("stereo.wav"), "--channels", "2", "-q"});
 #ifdef AVPOST_TOOL_HAVE_FFMPEG
     ASSERT_EQ(run.exitCode, 0) << run.err;
-    EXPECT_EQ(run.err, "avpost: " + Media("seven-one.wav") + ": 7.1 sound downmixed to stereo through libswresample\n");
+    EXPECT_EQ(run.err, "avpost: " + Input("seven-one.wav") + ": 7.1 sound downmixed to stereo through libswresample\n");
     // FL FR FC LFE BL BR SL SR.
     EXPECT_EQ(TonesHeard(out_.File("stereo.wav"), 8), "x.x.x.x. .xx..x.x");
-    ASSERT_EQ(Avpost({"audio", Media("seven-one.wav"), out_.File("six.wav"), "--channels", "6", "-q"}).exitCode, 0);
+    ASSERT_EQ(Avpost({"audio", Input("seven-one.wav"), out_.File("six.wav"), "--channels", "6", "-q"}).exitCode, 0);
     uint32_t mask = 0;
     const std::string six = TonesHeard(out_.File("six.wav"), 8, &mask);
     EXPECT_EQ(six.substr(4 * 9), "....x.x. .....x.x");  // back and side together on the surrounds
@@ -186,7 +207,7 @@ TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
 TEST_F(EverydayMedia, APhoneClipStoredSidewaysComesOutUprightLikeFfmpegShowsIt)
 {
     // FFmpeg's own upright pictures, turned by its transpose filter.
-    const RunResult reference = testing::RunProgram({"ffmpeg", "-v", "error", "-i", Media("portrait.mp4"), "-f",
+    const RunResult reference = testing::RunProgram({"ffmpeg", "-v", "error", "-i", Input("portrait.mp4"), "-f",
                                                      "yuv4mpegpipe", "-pix_fmt", "yuv420p", "-"});
     ASSERT_EQ(reference.exitCode, 0) << reference.err;
     const Pictures upright = ReadPictures(reference.out);
@@ -368,8 +389,8 @@ bool SomethingAppears(const testing::TempDir& dir, size_t already)
 
 TEST_F(EverydayMedia, AnInterruptedRunLeavesNothingBehindAndSaysWhichSignal)
 {
-    const std::string clip = ReadWholeFile(Media("clip.y4m"));
-    const std::string tone = ReadWholeFile(Media("stereo.wav"));
+    const std::string clip = ReadWholeFile(Input("clip.y4m"));
+    const std::string tone = ReadWholeFile(Input("stereo.wav"));
     const struct {
         const char* command;
         const std::string* input;
@@ -394,7 +415,7 @@ TEST_F(EverydayMedia, AnInterruptedRunLeavesNothingBehindAndSaysWhichSignal)
     const pid_t child = fork();
     if (child == 0) {
         dup2(fds[1], 1);
-        testing::Become({AVPOST_TOOL_PATH, "video", Media("clip.y4m"), "-", "--capture", "9=" + out_.File("late.bmp"), "-q"});
+        testing::Become({AVPOST_TOOL_PATH, "video", Input("clip.y4m"), "-", "--capture", "9=" + out_.File("late.bmp"), "-q"});
     }
     close(fds[1]);
     int status = 0;
