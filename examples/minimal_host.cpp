@@ -2,7 +2,7 @@
 // public functions, pulled picture by picture the way an encoder would pull it.
 #include <cstdio>
 
-#include "avpost.h"  // installed: <avpost/avpost.h>
+#include <avpost/avpost.h>
 
 // Ten 320 x 240 pictures at wobbling times around 25 per second, each a flat grey whose
 // level is its number, as a camera or a file decoder might deliver them.

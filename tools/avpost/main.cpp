@@ -1,20 +1,23 @@
 // avpost: the command-line host of the avpost library. See avpost --help.
+#include <cerrno>
 #include <csignal>
 #include <cstdio>
 #include <new>
 #include <string>
 #include <vector>
 
-#include "tools/avpost/Commands.h"
-#include "tools/avpost/Help.h"
-#include "tools/avpost/Options.h"
-#include "tools/avpost/StandardOutput.h"
-#include "tools/avpost/ToolError.h"
+#include "tools/avpost/cli/CommandLine.h"
+#include "tools/avpost/cli/Help.h"
+#include "tools/avpost/common/Interruption.h"
+#include "tools/avpost/common/ToolError.h"
+#include "tools/avpost/jobs/Commands.h"
+#include "tools/avpost/output/StandardOutput.h"
 
 namespace {
 
 constexpr int kFailed = 1;
 constexpr int kUsageError = 2;
+constexpr int kSignalBase = 128;
 
 int Fail(const char* message)
 {
@@ -23,10 +26,22 @@ int Fail(const char* message)
     return kFailed;
 }
 
+// A reader that went away (SIGPIPE) needs no word: it asked for nothing more.
+int Stopped(int signal)
+{
+    if (signal != SIGPIPE)
+        std::fprintf(stderr, "avpost: interrupted by %s; no output file was left behind\n",
+                     signal == SIGINT ? "SIGINT" : signal == SIGTERM ? "SIGTERM" : "SIGHUP");
+    return kSignalBase + signal;
+}
+
 int Execute(const avpost::tool::Invocation& call)
 {
     using avpost::tool::Command;
     switch (call.command) {
+    case Command::Usage:
+        std::fputs(avpost::tool::ShortUsage().c_str(), stderr);
+        return kUsageError;
     case Command::Help:
         std::fputs(avpost::tool::HelpText(call.helpTopic).c_str(), stdout);
         return 0;
@@ -50,8 +65,8 @@ int Execute(const avpost::tool::Invocation& call)
 
 int main(int argc, char** argv)
 {
-    // A closed pipe becomes a write error with a message instead of a silent death.
-    std::signal(SIGPIPE, SIG_IGN);
+    using avpost::tool::PendingInterruption;
+    avpost::tool::CatchInterruptions();
     avpost::tool::Invocation call;
     try {
         call = avpost::tool::ParseCommandLine(std::vector<std::string>(argv + 1, argv + argc));
@@ -62,10 +77,13 @@ int main(int argc, char** argv)
     try {
         const int status = Execute(call);
         if (std::fflush(avpost::tool::ResultStream()) != 0)
-            return Fail("standard output: write error");
+            return errno == EPIPE ? Stopped(SIGPIPE) : Fail("standard output: write error");
         return status;
+    } catch (const avpost::tool::Interrupted& interrupted) {
+        return Stopped(interrupted.signal());
     } catch (const avpost::tool::ToolError& error) {
-        return Fail(error.what());
+        // A read or write cut short by a signal fails like any other; the signal is the reason.
+        return PendingInterruption() != 0 ? Stopped(PendingInterruption()) : Fail(error.what());
     } catch (const std::bad_alloc&) {
         return Fail("out of memory");
     }

@@ -5,9 +5,11 @@
 #include <cstdio>
 #include <filesystem>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "ToolTestSupport.h"
+#include "tools/avpost/cli/Help.h"
 
 namespace avpost::tool {
 namespace {
@@ -27,7 +29,6 @@ protected:
         Make({"-f", "lavfi", "-i", "testsrc2=s=352x288:r=25:d=1", "-pix_fmt", "yuv420p", Media("clip.y4m")});
         Make({"-f", "lavfi", "-i", "testsrc2=s=64x48:r=25:d=0.2", "-pix_fmt", "yuv422p", Media("422.y4m")});
         Make({"-f", "lavfi", "-i", "sine=frequency=440:sample_rate=48000:duration=1", "-ac", "2", Media("tone.wav")});
-        Make({"-f", "lavfi", "-i", "sine=sample_rate=8000:duration=0.5", "-ac", "3", Media("three.wav")});
         Make({"-f", "lavfi", "-i", "color=c=white:s=64x32", "-frames:v", "1", "-pix_fmt", "bgr24", Media("white.bmp")});
 #ifdef AVPOST_TOOL_HAVE_FFMPEG
         MakeContainers();
@@ -71,7 +72,7 @@ TEST_F(ToolRuns, StreamsThroughStandardInputAndOutputConvertingAndMarkingOnlyWha
 {
     const RunResult video = Avpost({"video", "-", "-", "--watermark", Media("white.bmp")}, Media("clip.y4m"));
     ASSERT_EQ(video.exitCode, 0) << video.err;
-    const std::string header = "YUV4MPEG2 W352 H288 F25:1 I? A1:1 C420jpeg\n";
+    const std::string header = "YUV4MPEG2 W352 H288 F25:1 Ip A1:1 C420jpeg\n";  // as the input says
     EXPECT_EQ(video.out.substr(0, header.size() + 6), header + "FRAME\n");  // no library traces in the stream
     EXPECT_NE(video.err.find("-> standard output"), std::string::npos);
     // The input's pictures, with the white watermark at its own size near the top right corner.
@@ -144,13 +145,15 @@ TEST_F(ToolRuns, EachRunEndsWithOneLineAndAnExitCodeKeepingExistingOutputs)
         {{"video", out_.File("missing.mp4"), keep}, 1, out_.File("missing.mp4") + ": No such file or directory"},
         {{"video", out_.File("cut.y4m"), keep}, 1, out_.File("cut.y4m") + ": truncated data in picture 24"},
         {{"video", notes, keep}, 1, notes + ": not a"},
-        {{"audio", Media("three.wav"), out_.File("x.wav"), "--channels", "2"}, 1,
-         "--channels: cannot mix 3 channels into 2"},
+        {{"audio", Media("tone.wav"), out_.File("x.wav"), "--channels", "6", "--rate", "8000"}, 1,
+         "--rate: changing the sample rate needs a mono or stereo output"},
         {{"video", Media("clip.y4m"), out_.File("keep.mp4")}, 1, out_.File("keep.mp4") + ": avpost writes Y4M video"},
         {{"video", Media("clip.y4m"), keep, "--crop", "400:100:0:0"}, 1,
          "--crop: 400:100:0:0 reaches outside the 352x288 input"},
         {{"video", Media("clip.y4m"), keep, "--watermark", notes}, 1, notes + ": not a"},
         {{"video", Media("clip.y4m"), keep, "--fps", "fast"}, 2, "--fps: expected a rate"},
+        {{"video", Media("clip.y4m"), "/dev/null", "-q"}, 0, ""},  // devices are written, whatever their name
+        {{"audio", Media("tone.wav"), "/dev/null", "-q"}, 0, ""},
         {{"--help"}, 0, "avpost: "},
         {{"video", "--help"}, 0, "avpost video INPUT"},
         {{"--version"}, 0, "avpost "},
@@ -164,6 +167,8 @@ TEST_F(ToolRuns, EachRunEndsWithOneLineAndAnExitCodeKeepingExistingOutputs)
     }
     EXPECT_EQ(ReadWholeFile(keep), "precious");
     EXPECT_EQ(out_.List(), (std::vector<std::string>{"cut.y4m", "keep.y4m", "notes.txt"}));
+    const RunResult usage = Avpost({});
+    EXPECT_EQ(std::tie(usage.exitCode, usage.out, usage.err), std::make_tuple(2, "", ShortUsage()));
 }
 
 TEST_F(ToolRuns, DemoWritesItsFourFilesAndSaysWhatHappened)

@@ -18,7 +18,7 @@
 #include <string>
 #include <vector>
 
-#include "tools/avpost/ToolError.h"
+#include "tools/avpost/common/ToolError.h"
 
 namespace avpost::tool::testing {
 
@@ -73,8 +73,19 @@ struct RunResult {
     std::string err;
 };
 
-// Runs a program found on PATH (or by its path) with arguments, no shell involved; standard
-// input is empty unless stdinFile names a file to read it from.
+// In a child process: becomes the program found on PATH (or by its path), no shell involved.
+[[noreturn]] inline void Become(const std::vector<std::string>& command)
+{
+    std::vector<char*> argv;
+    for (const std::string& word : command)
+        argv.push_back(const_cast<char*>(word.c_str()));
+    argv.push_back(nullptr);
+    execvp(argv[0], argv.data());
+    _exit(127);
+}
+
+// Runs a program with arguments; standard input is empty unless stdinFile names a file to
+// read it from.
 inline RunResult RunProgram(const std::vector<std::string>& command, const std::string& stdinFile = "")
 {
     TempDir capture;
@@ -83,12 +94,7 @@ inline RunResult RunProgram(const std::vector<std::string>& command, const std::
         dup2(open(stdinFile.empty() ? "/dev/null" : stdinFile.c_str(), O_RDONLY), 0);
         dup2(open(capture.File("out").c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600), 1);
         dup2(open(capture.File("err").c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600), 2);
-        std::vector<char*> argv;
-        for (const std::string& word : command)
-            argv.push_back(const_cast<char*>(word.c_str()));
-        argv.push_back(nullptr);
-        execvp(argv[0], argv.data());
-        _exit(127);
+        Become(command);
     }
     RunResult result;
     int status = 0;

@@ -1,0 +1,56 @@
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cstdio>
+#include <string>
+#include <thread>
+
+#include "ToolTestSupport.h"
+#include "tools/avpost/report/Progress.h"
+#include "tools/avpost/report/Summary.h"
+
+namespace avpost::tool {
+namespace {
+
+TEST(ProgressLine, SaysWhereHowFastAndHowLongIsLeftWhenEnabledAndClearsItselfAway)
+{
+    const Progress known("video", 60.0, false);
+    EXPECT_EQ(known.Line(12.3, 310, 6.0), "video  12.3 s of 60.0 s  310 pictures  52 pictures/s  about 0:23 left");
+    const Progress unknown("audio", 0.0, false);
+    EXPECT_EQ(unknown.Line(75.26, 0, 2.0), "audio  75.3 s");
+
+    testing::TempDir dir;
+    std::FILE* terminal = std::fopen(dir.File("terminal").c_str(), "w");
+    {
+        Progress silent("video", 10.0, false, terminal);
+        std::this_thread::sleep_for(std::chrono::milliseconds(300));
+        silent.Update(1.0, 25);
+        Progress shown("video", 10.0, true, terminal);
+        shown.Update(0.5, 10);  // too soon after the start: not drawn
+        std::this_thread::sleep_for(std::chrono::milliseconds(300));
+        shown.Update(1.0, 25);
+    }
+    std::fclose(terminal);
+    const std::string text = testing::ReadWholeFile(dir.File("terminal"));
+    ASSERT_EQ(text.rfind("\rvideo  1.0 s of 10.0 s  25 pictures", 0), 0u) << text;  // nothing from the silent one
+    const size_t width = text.find('\r', 1) - 1;
+    EXPECT_EQ(text.substr(width + 1), "\r" + std::string(width, ' ') + "\r");  // cleared by the destructor
+}
+
+TEST(RunSummaries, CountRepeatsDropsFillsAndTrims)
+{
+    EXPECT_EQ(VideoSummary({150, 180, 42, 12, 640, 480, 30.0, {}}),
+              "150 pictures in, 180 out at 30/s as 640x480 (42 repeated, 12 dropped)");
+    EXPECT_NE(VideoSummary({150, 180, 42, 12, 640, 480, 30000.0 / 1001, {}}).find("at 29.97/s"), std::string::npos);
+
+    const AudioReport audio{6.004, 6.0, 0.325, 0.1954, 44100, {1, kMono}, {}};
+    EXPECT_EQ(AudioSummary(audio, true),
+              "6.00 s in, 6.00 s out at 44100 Hz mono (0.325 s of gaps filled, 0.195 s of overlap trimmed)");
+    EXPECT_EQ(AudioSummary(audio, false), "6.00 s in, 6.00 s out at 44100 Hz mono (the input has 0.325 s of gaps "
+                                           "and 0.195 s of overlap; --continuous would repair them)");
+    EXPECT_EQ(AudioSummary({6.004, 6.0, 0.0, 0.0, 44100, {6, kFivePointOneSide}, {}}, false),
+              "6.00 s in, 6.00 s out at 44100 Hz 5.1");
+}
+
+}  // namespace
+}  // namespace avpost::tool

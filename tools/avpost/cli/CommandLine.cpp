@@ -1,0 +1,192 @@
+#include "tools/avpost/cli/CommandLine.h"
+
+#include "tools/avpost/cli/OptionTable.h"
+#include "tools/avpost/cli/Values.h"
+#include "tools/avpost/common/ToolError.h"
+
+namespace avpost::tool {
+namespace {
+
+int ChoiceValue(const std::vector<Choice>& choices, const std::string& text, const std::string& what)
+{
+    for (const Choice& choice : choices)
+        if (text == choice.name)
+            return choice.value;
+    throw Expected{what};
+}
+
+OptionValue ValueOf(const OptionSpec& spec, const std::string& text)
+{
+    OptionValue value;
+    value.text = text;
+    switch (spec.kind) {
+    case ValueKind::Whole:
+        value.number = WholeNumber(text, spec.low, spec.high,
+                                   "a whole number from " + std::to_string(spec.low) + " to " +
+                                       std::to_string(spec.high));
+        break;
+    case ValueKind::Choice:
+        value.number = ChoiceValue(spec.choices, text, ChoiceNames(spec.choices));
+        break;
+    case ValueKind::ChoiceList:
+        for (const std::string& name : Split(text, ','))
+            value.number |= ChoiceValue(spec.choices, name, "a comma-separated list of " + ChoiceNames(spec.choices));
+        break;
+    case ValueKind::Switch:
+    case ValueKind::Text:
+        break;
+    }
+    return value;
+}
+
+void Apply(const OptionSpec& spec, Invocation& call, const std::string& text)
+{
+    try {
+        spec.apply(call, ValueOf(spec, text));
+    } catch (const Expected& expected) {
+        Fail(spec.name, "expected " + expected.what + ", got '" + text + "'");
+    }
+}
+
+void ApplyDefaults(Invocation& call)
+{
+    const unsigned bit = CommandBit(call.command);
+    for (const OptionSpec& spec : OptionTable())
+        if ((spec.commands & bit) != 0 && spec.defaultValue != nullptr)
+            Apply(spec, call, spec.defaultValue);
+}
+
+const char* CommandName(unsigned bit)
+{
+    return bit == kForDemo ? "demo" : bit == kForVideo ? "video" : "audio";
+}
+
+std::string CommandsOf(const OptionSpec& spec)
+{
+    std::string names;
+    for (unsigned bit : {kForDemo, kForVideo, kForAudio})
+        if ((spec.commands & bit) != 0)
+            names += std::string(names.empty() ? "" : " and ") + "'avpost " + CommandName(bit) + "'";
+    return names;
+}
+
+bool IsOption(const std::string& argument)
+{
+    return argument.size() > 1 && argument[0] == '-';
+}
+
+Command CommandNamed(const std::string& word)
+{
+    if (word == "demo")
+        return Command::Demo;
+    if (word == "video")
+        return Command::Video;
+    if (word == "audio")
+        return Command::Audio;
+    if (word == "help" || word == "--help" || word == "-h")
+        return Command::Help;
+    if (word == "--version")
+        return Command::Version;
+    Fail(word, "unknown command (use demo, video or audio; see avpost --help)");
+}
+
+// Applies the option at args[at]; returns how many arguments it used.
+size_t ApplyOption(Invocation& call, const std::vector<std::string>& args, size_t at)
+{
+    std::string name = args[at];
+    std::string value;
+    const size_t equals = name.find('=');
+    const bool inlineValue = equals != std::string::npos;
+    if (inlineValue) {
+        value = name.substr(equals + 1);
+        name = name.substr(0, equals);
+    }
+    const OptionSpec* spec = FindOption(name);
+    if (spec == nullptr)
+        Fail(name, "unknown option (see avpost --help)");
+    if ((spec->commands & CommandBit(call.command)) == 0)
+        Fail(name, "is an option of " + CommandsOf(*spec));
+    const bool takesValue = spec->kind != ValueKind::Switch;
+    size_t used = 1;
+    if (takesValue && !inlineValue) {
+        if (at + 1 >= args.size())
+            Fail(name, "needs a value");
+        value = args[at + 1];
+        used = 2;
+    } else if (!takesValue && inlineValue) {
+        Fail(name, "takes no value");
+    }
+    Apply(*spec, call, value);
+    if (spec->shapesRequest)
+        call.video.hasRequest = true;
+    return used;
+}
+
+// --help anywhere before "--" wins over everything else on the line, mistakes included.
+bool AsksForHelp(const std::vector<std::string>& args)
+{
+    for (const std::string& arg : args) {
+        if (arg == "--")
+            return false;
+        if (arg == "--help" || arg == "-h")
+            return true;
+    }
+    return false;
+}
+
+void Place(Invocation& call, std::vector<std::string>& positional)
+{
+    const size_t wanted = call.command == Command::Demo ? 1 : 2;
+    if (positional.size() > wanted)
+        Fail(positional[wanted], "unexpected argument");
+    if (call.command == Command::Demo) {
+        call.output = positional.empty() ? "avpost-demo" : positional[0];
+        return;
+    }
+    if (positional.size() < wanted)
+        Fail(call.command == Command::Video ? "avpost video" : "avpost audio",
+             positional.empty() ? "needs an INPUT and an OUTPUT" : "needs an OUTPUT after the INPUT");
+    call.input = positional[0];
+    call.output = positional[1];
+}
+
+}  // namespace
+
+Invocation ParseCommandLine(const std::vector<std::string>& args)
+{
+    Invocation call;
+    if (args.empty())
+        return call;
+    call.command = CommandNamed(args[0]);
+    if (call.command == Command::Help) {
+        call.helpTopic = args.size() > 1 ? args[1] : "";
+        return call;
+    }
+    if (call.command == Command::Version)
+        return call;
+    if (AsksForHelp(args)) {
+        call.command = Command::Help;
+        call.helpTopic = args[0];
+        return call;
+    }
+
+    ApplyDefaults(call);
+    std::vector<std::string> positional;
+    bool optionsEnded = false;
+    for (size_t at = 1; at < args.size();) {
+        const std::string& arg = args[at];
+        if (optionsEnded || !IsOption(arg)) {
+            positional.push_back(arg);
+            ++at;
+        } else if (arg == "--") {
+            optionsEnded = true;
+            ++at;
+        } else {
+            at += ApplyOption(call, args, at);
+        }
+    }
+    Place(call, positional);
+    return call;
+}
+
+}  // namespace avpost::tool

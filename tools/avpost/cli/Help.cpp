@@ -1,0 +1,199 @@
+#include "tools/avpost/cli/Help.h"
+
+#include "tools/avpost/cli/OptionTable.h"
+
+namespace avpost::tool {
+namespace {
+
+constexpr size_t kLineWidth = 80;
+constexpr size_t kTextColumn = 26;
+
+const char kOverview[] = R"(avpost: audio and video post-processing through the avpost library stages
+
+Usage:
+  avpost demo [FOLDER]                 run the stages on a built-in test source
+  avpost video INPUT OUTPUT [options]  process the pictures of a file into Y4M
+  avpost audio INPUT OUTPUT [options]  process the sound of a file into WAV
+  avpost help [demo|video|audio]       this text, or one command's part of it
+
+INPUT is a Y4M (4:2:0) or 16-bit PCM WAV file, or any media file that FFmpeg's
+libraries read (mp4, mkv, mov, ...) when avpost was built with them. OUTPUT is a
+.y4m (video) or .wav (audio) file, or a device such as /dev/null; "-" reads
+standard input (Y4M or WAV) or writes standard output, to pipe into an encoder.
+An output appears only when it is complete: a failed or interrupted run leaves
+no half-written file and keeps an existing one.
+
+@GENERAL@
+Exit status: 0 done, 1 failed (one line on standard error says why), 2 the
+command line is wrong, 128 + the signal's number when interrupted (130 for
+Ctrl-C, 143 for SIGTERM, 129 for SIGHUP, 141 when the reader of standard output
+went away).
+)";
+
+const char kDemoIntro[] = R"(
+avpost demo [FOLDER]
+  Runs a few seconds of interlaced 720x576 16:9 test pictures with irregular
+  time stamps, and 48 kHz stereo sound in blocks with gaps and overlaps, through
+  the video and audio stages with a representative configuration, and writes
+  into FOLDER (default: avpost-demo) demo.y4m, demo.wav, capture.bmp and
+  capture.jpg.
+)";
+
+const char kVideoIntro[] = R"(
+avpost video INPUT OUTPUT.y4m [options]
+  Without options the pictures keep their size, pixel aspect and rate. Steps run
+  in this order: rotation, deinterlacing, crop and resize, brightness, contrast
+  and saturation, filters, mirrors, the user watermark, the fixed watermark.
+)";
+
+const char kAudioIntro[] = R"(
+avpost audio INPUT OUTPUT.wav [options]
+  Writes 16-bit PCM; more than two channels carry their speaker layout.
+)";
+
+const std::vector<HelpExample> kDemoExamples = {
+    {"demo /tmp/avpost-demo", "&& ffplay /tmp/avpost-demo/demo.y4m"}};
+const std::vector<HelpExample> kVideoExamples = {
+    {"video talk.mp4 talk.y4m --size 1280x720 --fps 25", ""},
+    {"video tape.mkv - --deinterlace even-average --size 640x480", "| ffmpeg -i - -c:v libx264 tape.mp4"},
+    {"video phone.mp4 phone.y4m --size 1280x720 --fit keep", ""},
+    {"video cam.mov cam.y4m --watermark logo.png --watermark-pos bottom-left --watermark-level 70 "
+     "--capture 0:01:02.5=still.jpg",
+     ""},
+    {"video in.y4m out.y4m --crop 640:360:40:60 --contrast 20 --filter emboss,sepia", ""}};
+const std::vector<HelpExample> kAudioExamples = {
+    {"audio talk.mp4 talk.wav --rate 44100 --channels 2 --continuous", ""},
+    {"audio movie.mkv movie.wav --channels 2", ""},
+    {"audio in.wav - --volume 50", "| ffmpeg -i - quiet.mp3"}};
+
+// Appends words to text, breaking lines at kLineWidth and starting new ones at indent.
+void AppendWrapped(std::string& text, const std::string& words, size_t indent)
+{
+    size_t column = text.size() - (text.rfind('\n') == std::string::npos ? 0 : text.rfind('\n') + 1);
+    size_t start = 0;
+    while (start < words.size()) {
+        size_t end = words.find(' ', start);
+        if (end == std::string::npos)
+            end = words.size();
+        const std::string word = words.substr(start, end - start);
+        if (column > indent && column + 1 + word.size() > kLineWidth) {
+            text += "\n" + std::string(indent, ' ');
+            column = indent;
+        } else if (column > indent) {
+            text += ' ';
+            ++column;
+        }
+        text += word;
+        column += word.size();
+        start = end + 1;
+    }
+}
+
+// "(-100 ... 100; default 0)", "(keep, stretch, ... or 4:3; default keep)".
+std::string Bounds(const OptionSpec& spec)
+{
+    std::string bounds;
+    if (spec.kind == ValueKind::Whole)
+        bounds = std::to_string(spec.low) + " ... " + std::to_string(spec.high);
+    else if (spec.kind == ValueKind::Choice)
+        bounds = ChoiceNames(spec.choices);
+    if (spec.defaultValue != nullptr)
+        bounds += (bounds.empty() ? "" : "; ") + std::string("default ") + spec.defaultValue;
+    else if (spec.defaultMeaning != nullptr)
+        bounds += (bounds.empty() ? "" : "; ") + std::string("default: ") + spec.defaultMeaning;
+    return bounds.empty() ? "" : "(" + bounds + ")";
+}
+
+std::string OptionLine(const OptionSpec& spec, const std::string& indent)
+{
+    std::string line = indent + (spec.alias != nullptr ? std::string(spec.alias) + ", " : "") + spec.name;
+    if (spec.placeholder != nullptr)
+        line += std::string(" ") + spec.placeholder;
+    line += line.size() + 2 <= kTextColumn ? std::string(kTextColumn - line.size(), ' ')
+                                           : "\n" + std::string(kTextColumn, ' ');
+    AppendWrapped(line, std::string(spec.help) + " " + Bounds(spec), kTextColumn);
+    return line + "\n";
+}
+
+bool IsGeneral(const OptionSpec& spec)
+{
+    return spec.commands == (kForDemo | kForVideo | kForAudio);
+}
+
+// The options of a command, under their headings; the general ones are listed once, in the
+// overview.
+std::string OptionList(unsigned command)
+{
+    std::string text;
+    const char* group = nullptr;
+    for (const OptionSpec& spec : OptionTable()) {
+        if ((spec.commands & command) == 0 || IsGeneral(spec))
+            continue;
+        if (group == nullptr || std::string(group) != spec.group) {
+            group = spec.group;
+            text += std::string("  ") + group + ":\n";
+        }
+        text += OptionLine(spec, "    ");
+    }
+    return text;
+}
+
+std::string Overview()
+{
+    std::string general = "General options:\n";
+    for (const OptionSpec& spec : OptionTable())
+        if (IsGeneral(spec))
+            general += OptionLine(spec, "  ");
+    general += "  --version" + std::string(kTextColumn - 11, ' ') + "the version\n";
+    std::string text = kOverview;
+    return text.replace(text.find("@GENERAL@\n"), 10, general);
+}
+
+std::string ExampleList(const std::vector<HelpExample>& examples)
+{
+    std::string text = "  Examples:\n";
+    for (const HelpExample& example : examples) {
+        std::string line = "    avpost ";
+        AppendWrapped(line, std::string(example.arguments) + (*example.then ? " " : "") + example.then, 8);
+        text += line + "\n";
+    }
+    return text;
+}
+
+std::string CommandHelp(const std::string& topic)
+{
+    if (topic == "demo")
+        return std::string(kDemoIntro) + ExampleList(kDemoExamples);
+    if (topic == "video")
+        return std::string(kVideoIntro) + OptionList(kForVideo) + ExampleList(kVideoExamples);
+    return std::string(kAudioIntro) + OptionList(kForAudio) + ExampleList(kAudioExamples);
+}
+
+}  // namespace
+
+std::string HelpText(const std::string& topic)
+{
+    if (topic == "demo" || topic == "video" || topic == "audio")
+        return CommandHelp(topic).substr(1);
+    return Overview() + CommandHelp("demo") + CommandHelp("video") + CommandHelp("audio");
+}
+
+std::string ShortUsage()
+{
+    return "usage: avpost demo [FOLDER]\n"
+           "       avpost video INPUT OUTPUT.y4m [options]\n"
+           "       avpost audio INPUT OUTPUT.wav [options]\n"
+           "       avpost --help   (every option, with examples)\n";
+}
+
+std::string VersionText()
+{
+    return "avpost " AVPOST_VERSION "\n";
+}
+
+const std::vector<HelpExample>& HelpExamples(const std::string& command)
+{
+    return command == "demo" ? kDemoExamples : command == "video" ? kVideoExamples : kAudioExamples;
+}
+
+}  // namespace avpost::tool

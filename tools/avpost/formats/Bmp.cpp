@@ -1,0 +1,100 @@
+#include "tools/avpost/formats/Bmp.h"
+
+#include <cstring>
+
+#include "tools/avpost/common/ToolError.h"
+#include "tools/avpost/formats/ByteSource.h"
+#include "tools/avpost/formats/Y4m.h"
+
+namespace avpost::tool {
+namespace {
+
+constexpr size_t kFileHeaderBytes = 14;
+constexpr size_t kInfoHeaderBytes = 40;
+constexpr uint32_t kUncompressed = 0;
+constexpr uint32_t kBitFields = 3;
+
+uint32_t Le32(const unsigned char* p)
+{
+    return static_cast<uint32_t>(p[0]) | static_cast<uint32_t>(p[1]) << 8 | static_cast<uint32_t>(p[2]) << 16 |
+           static_cast<uint32_t>(p[3]) << 24;
+}
+
+bool AllTransparent(const Bitmap32& bitmap)
+{
+    for (size_t i = 3; i < bitmap.pixels.size(); i += 4)
+        if (bitmap.pixels[i] != 0)
+            return false;
+    return true;
+}
+
+void MakeOpaque(Bitmap32& bitmap)
+{
+    for (size_t i = 3; i < bitmap.pixels.size(); i += 4)
+        bitmap.pixels[i] = 255;
+}
+
+}  // namespace
+
+tagBITMAPINFO Bitmap32::Header() const
+{
+    tagBITMAPINFO info{};
+    info.bmiHeader.biSize = sizeof(tagBITMAPINFOHEADER);
+    info.bmiHeader.biWidth = width;
+    info.bmiHeader.biHeight = height;
+    info.bmiHeader.biPlanes = 1;
+    info.bmiHeader.biBitCount = 32;
+    info.bmiHeader.biSizeImage = static_cast<uint32_t>(pixels.size());
+    return info;
+}
+
+Bitmap32 ReadBmp(ByteSource& file)
+{
+    const std::string& path = file.name();
+    unsigned char header[kFileHeaderBytes + kInfoHeaderBytes];
+    const size_t got = file.Read(header, sizeof(header));
+    if (got < 2 || std::memcmp(header, "BM", 2) != 0)
+        Fail(path, "not a BMP file");
+    if (got < sizeof(header))
+        Fail(path, "truncated BMP header");
+    const uint32_t dataOffset = Le32(header + 10);
+    const auto width = static_cast<int32_t>(Le32(header + 18));
+    const auto rawHeight = static_cast<int32_t>(Le32(header + 22));
+    const unsigned bits = header[28] | header[29] << 8;
+    const uint32_t compression = Le32(header + 30);
+    const int height = rawHeight < 0 ? -rawHeight : rawHeight;
+    if (width <= 0 || height <= 0 || width > kLargestPictureSide || height > kLargestPictureSide)
+        Fail(path, "BMP has an unusable size");
+    if (bits != 24 && bits != 32)
+        Fail(path, "unsupported BMP: " + std::to_string(bits) + " bits per pixel (24 and 32 are read)");
+    if (compression != kUncompressed && !(compression == kBitFields && bits == 32))
+        Fail(path, "unsupported BMP: compressed pixels (only uncompressed BMP is read)");
+
+    // Skip whatever lies between the headers and the pixels (masks, colour profile).
+    std::vector<unsigned char> scrap(dataOffset > sizeof(header) ? dataOffset - sizeof(header) : 0);
+    if (dataOffset < sizeof(header) || !file.ReadExactly(scrap.data(), scrap.size(), "BMP header"))
+        Fail(path, "BMP pixel data offset is invalid");
+
+    const size_t stride = (static_cast<size_t>(width) * bits / 8 + 3) & ~size_t{3};
+    std::vector<unsigned char> row(stride);
+    Bitmap32 bitmap(width, height);
+    for (int r = 0; r < height; ++r) {
+        if (!file.ReadExactly(row.data(), stride, "BMP pixel data"))
+            Fail(path, "truncated BMP pixel data");
+        // Positive heights store the bottom row first.
+        const int y = rawHeight > 0 ? height - 1 - r : r;
+        for (int x = 0; x < width; ++x) {
+            const unsigned char* in = &row[static_cast<size_t>(x) * bits / 8];
+            uint8_t* out = bitmap.At(x, y);
+            out[0] = in[0];
+            out[1] = in[1];
+            out[2] = in[2];
+            out[3] = bits == 32 ? in[3] : 255;
+        }
+    }
+    if (bits == 32 && AllTransparent(bitmap))
+        MakeOpaque(bitmap);  // writers that fill the fourth byte with 0 mean "no alpha"
+    return bitmap;
+}
+
+}  // namespace avpost::tool
