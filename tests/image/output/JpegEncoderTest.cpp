@@ -60,6 +60,14 @@ TEST(JpegScan, FlatGreyPicturesCodeEachBlocksDcAndOneEndOfBlock)
     }
 }
 
+uint64_t Fnv1a(const Bytes& bytes)
+{
+    uint64_t hash = 14695981039346656037ull;
+    for (unsigned char b : bytes)
+        hash = (hash ^ b) * 1099511628211ull;
+    return hash;
+}
+
 // Pinned when the x86-64 and 32-bit builds agreed: the arithmetic, rounding included, must
 // give the same bytes on every build.
 TEST(JpegScan, EveryBuildWritesTheSameBytes)
@@ -67,11 +75,61 @@ TEST(JpegScan, EveryBuildWritesTheSameBytes)
     ScratchDir dir;
     DibImage noise;
     avpost_test::PaintNoise(noise, 45, 29, 11);
-    const Bytes jpeg = EncodeJpeg(noise, dir);
-    uint64_t hash = 14695981039346656037ull;  // FNV-1a
-    for (unsigned char b : jpeg)
-        hash = (hash ^ b) * 1099511628211ull;
-    EXPECT_EQ(hash, 2173301848693968694ull);
+    EXPECT_EQ(Fnv1a(EncodeJpeg(noise, dir)), 2173301848693968694ull);
+}
+
+// Pictures that reach every path of the coder: noise (large values, stuffed FF bytes), smooth
+// gradients (long zero runs, padding by repetition), one-pixel checks (energy up to the last
+// zigzag position, runs of 16 zeros and more) and saturated colours (the ends of the chroma range).
+enum class Content { kNoise, kGradient, kChecks, kSaturated };
+
+void PaintContent(DibImage& image, int width, int height, Content content)
+{
+    switch (content) {
+    case Content::kNoise:
+        return avpost_test::PaintNoise(image, width, height, static_cast<uint32_t>(width * 131 + height));
+    case Content::kGradient:
+        return avpost_test::PaintGradient(image, width, height);
+    case Content::kChecks:
+        return avpost_test::Paint(image, width, height, [](int x, int y, int c) { return (x + y + c) % 2 * 255; });
+    case Content::kSaturated:
+        // Yellow, cyan, blue, red ... in one-pixel-wide diagonal bands of the eight corners of the RGB cube.
+        return avpost_test::Paint(image, width, height,
+                                  [](int x, int y, int c) { return ((x + 2 * y) / 3 % 8 >> c & 1) * 255; });
+    }
+}
+
+// Pinned from the encoder as first written, agreed by the x86-64, 32-bit and sanitizer builds:
+// whole blocks, odd sizes, single rows and columns.
+TEST(JpegScan, PinnedFilesAcrossSizes)
+{
+    const struct {
+        int width, height;
+        Content content;
+        uint64_t hash;
+    } cases[] = {
+        {1, 1, Content::kNoise, 4202928657668981349ull},
+        {8, 8, Content::kNoise, 2096077637085012109ull},
+        {9, 7, Content::kNoise, 2546781633652468741ull},
+        {64, 48, Content::kNoise, 4746689434414567178ull},
+        {67, 33, Content::kNoise, 17353925480773855651ull},
+        {1, 37, Content::kNoise, 8583439818104409794ull},
+        {203, 1, Content::kNoise, 5750935098234129895ull},
+        {16, 16, Content::kGradient, 7062311530282425889ull},
+        {161, 95, Content::kGradient, 4027701855513303729ull},
+        {320, 240, Content::kGradient, 4124311777100302406ull},
+        {8, 8, Content::kChecks, 15888048445037434470ull},
+        {77, 41, Content::kChecks, 15492450617705220120ull},
+        {24, 24, Content::kSaturated, 14861674594231001901ull},
+        {99, 51, Content::kSaturated, 1968099523827378989ull},
+    };
+    ScratchDir dir;
+    for (const auto& c : cases) {
+        DibImage image;
+        PaintContent(image, c.width, c.height, c.content);
+        EXPECT_EQ(Fnv1a(EncodeJpeg(image, dir)), c.hash)
+            << c.width << "x" << c.height << " content " << static_cast<int>(c.content);
+    }
 }
 
 // Other depths, a damaged header, missing rows, a size with no rows behind it, and names
