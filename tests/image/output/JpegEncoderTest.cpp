@@ -8,6 +8,8 @@
 
 #include "OutputTestFiles.h"
 #include "image/output/DibImage.h"
+#include "support/CpuFeatures.h"
+#include "support/SimdLevels.h"
 
 namespace {
 
@@ -79,9 +81,27 @@ TEST(JpegScan, EveryBuildWritesTheSameBytes)
 }
 
 // Pictures that reach every path of the coder: noise (large values, stuffed FF bytes), smooth
-// gradients (long zero runs, padding by repetition), one-pixel checks (energy up to the last
-// zigzag position, runs of 16 zeros and more) and saturated colours (the ends of the chroma range).
-enum class Content { kNoise, kGradient, kChecks, kSaturated };
+// gradients (padding by repetition), one-pixel checks, saturated colours (the ends of the chroma
+// range) and single DCT basis functions, one frequency per block and channel (zero runs of every
+// length, 16 and more included, up to the last zigzag position).
+enum class Content { kNoise, kGradient, kChecks, kSaturated, kBasis };
+
+// cos(m pi / 16) x 1000, in integers so that every build paints the same picture.
+int Cosine(int m)
+{
+    constexpr int kQuarter[9] = {1000, 981, 924, 831, 707, 556, 383, 195, 0};
+    m %= 32;
+    if (m > 16)
+        m = 32 - m;
+    return m <= 8 ? kQuarter[m] : -kQuarter[16 - m];
+}
+
+int BasisSample(int x, int y, int channel)
+{
+    const int frequency = 1 + ((x / 8) * 5 + (y / 8) * 11 + channel * 21) % 63;
+    const int wave = Cosine((2 * (x % 8) + 1) * (frequency % 8)) * Cosine((2 * (y % 8) + 1) * (frequency / 8));
+    return 128 + 110 * wave / 1000000;
+}
 
 void PaintContent(DibImage& image, int width, int height, Content content)
 {
@@ -92,6 +112,8 @@ void PaintContent(DibImage& image, int width, int height, Content content)
         return avpost_test::PaintGradient(image, width, height);
     case Content::kChecks:
         return avpost_test::Paint(image, width, height, [](int x, int y, int c) { return (x + y + c) % 2 * 255; });
+    case Content::kBasis:
+        return avpost_test::Paint(image, width, height, BasisSample);
     case Content::kSaturated:
         // Yellow, cyan, blue, red ... in one-pixel-wide diagonal bands of the eight corners of the RGB cube.
         return avpost_test::Paint(image, width, height,
@@ -100,7 +122,7 @@ void PaintContent(DibImage& image, int width, int height, Content content)
 }
 
 // Pinned from the encoder as first written, agreed by the x86-64, 32-bit and sanitizer builds:
-// whole blocks, odd sizes, single rows and columns.
+// whole blocks, odd sizes, single rows and columns; the same bytes at every instruction-set level.
 TEST(JpegScan, PinnedFilesAcrossSizes)
 {
     const struct {
@@ -122,18 +144,23 @@ TEST(JpegScan, PinnedFilesAcrossSizes)
         {77, 41, Content::kChecks, 15492450617705220120ull},
         {24, 24, Content::kSaturated, 14861674594231001901ull},
         {99, 51, Content::kSaturated, 1968099523827378989ull},
+        {64, 64, Content::kBasis, 6607009278063751447ull},
+        {203, 99, Content::kBasis, 15099398329717187023ull},
     };
     ScratchDir dir;
-    for (const auto& c : cases) {
-        DibImage image;
-        PaintContent(image, c.width, c.height, c.content);
-        EXPECT_EQ(Fnv1a(EncodeJpeg(image, dir)), c.hash)
-            << c.width << "x" << c.height << " content " << static_cast<int>(c.content);
+    for (avpost::simd::Level level : AvailableSimdLevels()) {
+        avpost::simd::ScopedLevel pin(level);
+        for (const auto& c : cases) {
+            DibImage image;
+            PaintContent(image, c.width, c.height, c.content);
+            EXPECT_EQ(Fnv1a(EncodeJpeg(image, dir)), c.hash) << avpost::simd::NameOf(level) << ", " << c.width << "x"
+                                                              << c.height << " content " << static_cast<int>(c.content);
+        }
     }
 }
 
-// Other depths, a damaged header, missing rows, a size with no rows behind it, and names
-// longer than 511 bytes.
+// Other depths, a damaged header, missing rows, a size with no rows behind it, names longer
+// than 511 bytes, and JPEG files that cannot be created or written.
 TEST(JpegRefusals, WhatItCannotUseWritesNothing)
 {
     ScratchDir dir;
@@ -164,6 +191,9 @@ TEST(JpegRefusals, WhatItCannotUseWritesNothing)
     EXPECT_EQ(BMP2JPEG(good.c_str(), longest.c_str()), 0);
     EXPECT_TRUE(std::filesystem::exists(longest));
     EXPECT_EQ(BMP2JPEG(good.c_str(), dir.File("missing/out.jpg").c_str()), EOF);
+    // A device that takes nothing: the failed write is reported, and the device left alone.
+    EXPECT_EQ(BMP2JPEG(good.c_str(), "/dev/full"), EOF);
+    EXPECT_TRUE(std::filesystem::exists("/dev/full"));
 }
 
 // Pictures large enough for the conversions to overlap.
