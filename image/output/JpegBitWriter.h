@@ -3,46 +3,95 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <vector>
+#include <memory>
 
 namespace avpost::jpeg {
 
-// The JPEG file in memory, with the bit writer of its entropy-coded data. Codes go in most
-// significant bit first; whole bytes come out, each FF byte followed by a 00 byte so that the
-// scan holds no marker. Codes gather in a 64-bit word that leaves eight bytes at a time.
-class JpegBitWriter {
-public:
-    // Appends the low `length` bits of `bits` (length 0 ... 32; the bits above must be zero).
+// The writing position in the entropy-coded data. Codes go in most significant bit first and
+// gather in a 64-bit word, which leaves as eight whole bytes, each FF byte followed by a 00 byte
+// so that the scan holds no marker. A value: coding loops keep it in a local, where its state can
+// stay in registers, and write to room that JpegBitWriter::Begin made.
+struct BitCursor {
+    uint64_t pending;    // the low 64 - free bits are still to be written
+    int free;
+    unsigned char* out;  // the next byte
+
+    // Appends the low `length` bits of `bits` (length 0 ... 32; the bits above must be zero);
+    // writes at most 16 bytes.
     void Put(uint32_t bits, int length)
     {
-        if (length < free_) {
-            pending_ = (pending_ << length) | bits;
-            free_ -= length;
+        if (length < free) {
+            pending = (pending << length) | bits;
+            free -= length;
             return;
         }
         // The word fills up: its last free bits take the code's leading bits, and the code's
         // remaining bits start the next word. Bits above the valid ones are ones already
         // written; later shifts push them out.
-        const int spill = length - free_;
-        pending_ = (pending_ << free_) | (bits >> spill);
+        const int spill = length - free;
+        pending = (pending << free) | (bits >> spill);
         PutWord();
-        pending_ = bits;
-        free_ = 64 - spill;
+        pending = bits;
+        free = 64 - spill;
     }
 
     // Completes the last byte with one-bits (a whole byte of them when the data ends on a byte
-    // boundary) and writes out every pending bit.
+    // boundary) and writes out every pending bit; at most 16 bytes.
+    void PadWithOnes();
+
+private:
+    void PutWord()
+    {
+        if (HasFFByte(pending)) {
+            out = PutBytesStuffed(out, pending, 64);
+            return;
+        }
+        for (int i = 0; i < 8; ++i)
+            out[i] = static_cast<unsigned char>(pending >> (56 - 8 * i));
+        out += 8;
+    }
+
+    // Exact for every word: x has a zero byte where the word has FF.
+    static bool HasFFByte(uint64_t word)
+    {
+        const uint64_t x = ~word;
+        return ((x - 0x0101010101010101ull) & ~x & 0x8080808080808080ull) != 0;
+    }
+
+    // The low `count` bits of word (a multiple of 8), most significant byte first.
+    static unsigned char* PutBytesStuffed(unsigned char* out, uint64_t word, int count);
+};
+
+// The JPEG file in memory, with the bit writer of its entropy-coded data.
+class JpegBitWriter {
+public:
+    // The cursor, with room for `bytes` bytes behind it; End takes it back.
+    BitCursor Begin(size_t bytes)
+    {
+        if (capacity_ - used_ < bytes)
+            Grow(bytes);
+        return {pending_, free_, bytes_.get() + used_};
+    }
+    void End(const BitCursor& cursor)
+    {
+        pending_ = cursor.pending;
+        free_ = cursor.free;
+        used_ = static_cast<size_t>(cursor.out - bytes_.get());
+    }
+
+    // Codes of any length: bits beyond the low 16 of `value` count as zeros.
+    void PutBits(unsigned value, int length);
     void PadWithOnes();
 
     // A byte outside the entropy-coded data (markers, segments): only with no bits pending.
     void PutByte(unsigned char byte)
     {
-        if (used_ == bytes_.size())
-            Grow();
+        if (used_ == capacity_)
+            Grow(1);
         bytes_[used_++] = byte;
     }
 
-    const unsigned char* data() const { return bytes_.data(); }
+    const unsigned char* data() const { return bytes_.get(); }
     size_t size() const { return used_; }
 
     // Forgets the bytes written so far; pending bits stay.
@@ -58,36 +107,14 @@ public:
     void Release();
 
 private:
-    static constexpr size_t kMostBytesPerWord = 16;  // eight bytes, each possibly stuffed
+    // Room for at least `bytes` more bytes and at least twice the capacity; the written bytes
+    // move along, the rest is left uninitialised.
+    void Grow(size_t bytes);
 
-    void PutWord()
-    {
-        if (bytes_.size() - used_ < kMostBytesPerWord)
-            Grow();
-        unsigned char* out = bytes_.data() + used_;
-        if (!HasFFByte(pending_)) {
-            for (int i = 0; i < 8; ++i)
-                out[i] = static_cast<unsigned char>(pending_ >> (56 - 8 * i));
-            used_ += 8;
-            return;
-        }
-        PutBytesStuffed(pending_, 64);
-    }
-
-    // Exact for every word: x has a zero byte where the word has FF.
-    static bool HasFFByte(uint64_t word)
-    {
-        const uint64_t x = ~word;
-        return ((x - 0x0101010101010101ull) & ~x & 0x8080808080808080ull) != 0;
-    }
-
-    // The low `count` bits of word (a multiple of 8), most significant byte first.
-    void PutBytesStuffed(uint64_t word, int count);
-    void Grow();
-
-    std::vector<unsigned char> bytes_;
+    std::unique_ptr<unsigned char[]> bytes_;
+    size_t capacity_ = 0;
     size_t used_ = 0;
-    uint64_t pending_ = 0;  // the low 64 - free_ bits are still to be written
+    uint64_t pending_ = 0;
     int free_ = 64;
 };
 

@@ -23,6 +23,7 @@
 #include <utility>
 #include <vector>
 
+#include "image/output/BlockPaddedBmp.h"
 #include "image/output/JpegBitWriter.h"
 #include "image/output/JpegColour.h"
 #include "image/output/JpegTransform.h"
@@ -119,8 +120,6 @@ constexpr unsigned char kEndOfBlock = 0x00;
 constexpr unsigned char kSixteenZeros = 0xF0;
 constexpr size_t kMaxPathBytes = 511;  // the paths' buffers hold 512 bytes with the terminator
 
-constexpr size_t kBmpHeaderSize = 54;
-constexpr int kBmpBitCountOffset = 28;
 
 // ---------------------------------------------------------------------------------------------
 // 2. The encoder's state: one conversion at a time, under encoderMutex.
@@ -166,9 +165,6 @@ struct Encoder {
 
     bool InitAll();
     bool LoadBitmap(const char* path, unsigned short* pictureWidth, unsigned short* pictureHeight);
-    void PutCoded(const bitstring* codes, int value);
-    void CodeBlock(const short* du, uint64_t nonzero, int& predictor, const bitstring* dcTable,
-                   const bitstring* acTable);
     void MainEncoder();
 
     void WriteApp0();
@@ -191,17 +187,7 @@ void Encoder::PutWord(unsigned short word)
     PutByte(static_cast<unsigned char>(word & 0xFF));
 }
 
-// A code of any length: bits beyond the 16 of value count as zeros.
-void Encoder::WriteBits(bitstring bits)
-{
-    int length = bits.length;
-    while (length > 16) {
-        const int zeros = std::min(length - 16, 32);
-        writer.Put(0, zeros);
-        length -= zeros;
-    }
-    writer.Put(bits.value & ((1u << length) - 1), length);
-}
+void Encoder::WriteBits(bitstring bits) { writer.PutBits(bits.value, bits.length); }
 
 // ---------------------------------------------------------------------------------------------
 // 3. Table building
@@ -280,115 +266,74 @@ bool Encoder::InitAll()
 }
 
 // ---------------------------------------------------------------------------------------------
-// 4. Reading the BMP
+// 4. Reading the BMP (BlockPaddedBmp.h)
 
-uint32_t RoundUpTo8(uint32_t n) { return (n + 7) & ~uint32_t{7}; }
-
-struct FileCloser {
-    void operator()(std::FILE* f) const { std::fclose(f); }
-};
-using FilePtr = std::unique_ptr<std::FILE, FileCloser>;
-
-// The file must hold every pixel row it announces, so a damaged header cannot make us
-// allocate or encode a picture that is not there.
-bool HoldsPixelRows(const char* path, uint32_t pictureHeight, uint32_t fileRowBytes)
-{
-    std::error_code error;
-    const std::uintmax_t size = std::filesystem::file_size(path, error);
-    return !error && size >= kBmpHeaderSize + std::uintmax_t{pictureHeight} * fileRowBytes;
-}
-
-// Rows are read bottom row first, each widened to whole blocks by repeating its last pixel,
-// then put top row first; the bottom row is repeated down to a whole block row.
 bool Encoder::LoadBitmap(const char* path, unsigned short* pictureWidth, unsigned short* pictureHeight)
 {
-    FilePtr file(std::fopen(path, "rb"));
-    if (!file)
+    BlockPaddedPicture picture;
+    if (!ReadBlockPaddedBmp(path, picture))
         return false;
-    unsigned char header[kBmpHeaderSize];
-    if (std::fread(header, 1, kBmpHeaderSize, file.get()) != kBmpHeaderSize || header[0] != 'B' ||
-        header[1] != 'M' || header[kBmpBitCountOffset] != 24)
-        return false;
-
-    const uint32_t w = header[18] + 256u * header[19];
-    const uint32_t h = header[22] + 256u * header[23];
-    const uint32_t rowBytes = w * 3;
-    const uint32_t padBytes = rowBytes % 4 == 0 ? 0 : 4 - rowBytes % 4;
-    if (!HoldsPixelRows(path, h, rowBytes + padBytes))
-        return false;
-
-    const uint32_t w8 = RoundUpTo8(w);
-    const uint32_t h8 = RoundUpTo8(h);
-    const uint64_t bufferBytes = uint64_t{w8} * h8 * 3;
-    if (bufferBytes > SIZE_MAX)
-        return false;
-    std::unique_ptr<unsigned char[]> buffer(new (std::nothrow) unsigned char[static_cast<size_t>(bufferBytes)]);
-    if (!buffer)
-        return false;
-
-    const size_t bufferRow = size_t{w8} * 3;
-    for (uint32_t r = 0; r < h; ++r) {
-        unsigned char* row = buffer.get() + r * bufferRow;
-        unsigned char padding[3];
-        if (std::fread(row, 1, rowBytes, file.get()) != rowBytes ||
-            std::fread(padding, 1, padBytes, file.get()) != padBytes)
-            return false;
-        for (uint32_t col = w; col < w8; ++col)
-            std::memcpy(row + col * 3, row + (w - 1) * 3, 3);
-    }
-    for (uint32_t top = 0, bottom = h; top + 1 < bottom; ++top, --bottom)
-        std::swap_ranges(buffer.get() + top * bufferRow, buffer.get() + (top + 1) * bufferRow,
-                         buffer.get() + (bottom - 1) * bufferRow);
-    for (uint32_t r = h; r < h8; ++r)
-        std::memcpy(buffer.get() + r * bufferRow, buffer.get() + (h - 1) * bufferRow, bufferRow);
-
-    RGB_buffer = std::move(buffer);
-    rgbBufferSize = static_cast<size_t>(bufferBytes);
-    width = w8;
-    height = h8;
+    RGB_buffer = std::move(picture.pixels);
+    rgbBufferSize = picture.Bytes();
+    width = picture.paddedWidth;
+    height = picture.paddedHeight;
     if (pictureWidth != nullptr)
-        *pictureWidth = static_cast<unsigned short>(w);
+        *pictureWidth = static_cast<unsigned short>(picture.width);
     if (pictureHeight != nullptr)
-        *pictureHeight = static_cast<unsigned short>(h);
+        *pictureHeight = static_cast<unsigned short>(picture.height);
     return true;
 }
 
 // ---------------------------------------------------------------------------------------------
 // 5. Coding the blocks
 
-// The Huffman code of the value's category among codes, then the value's extra bits.
-[[gnu::always_inline]] inline void Encoder::PutCoded(const bitstring* codes, int value)
-{
-    const bitstring code = codes[categoryTable[value + kLargestMagnitude]];
-    const bitstring extra = bitcodeTable[value + kLargestMagnitude];
-    writer.Put((uint32_t{code.value} << extra.length) | extra.value, code.length + extra.length);
-}
+// Codes quantised blocks into a cursor. Holds copies of what the inner loop reads, so that
+// nothing is read again after each byte written.
+struct BlockCoder {
+    const unsigned char* category;  // both indexed by values -32767 ... 32767
+    const bitstring* bitcode;
+    avpost::jpeg::BitCursor cursor;
 
-// du: quantised coefficients in natural order; nonzero: bit k set when zigzag position k is
-// not 0. The DC codes its difference from the predictor (a difference of 0 is category 0 with
-// no extra bits); each nonzero AC value codes the run of zeros before it, in whole runs of
-// sixteen first; an end-of-block code follows unless the last position is nonzero.
-void Encoder::CodeBlock(const short* du, uint64_t nonzero, int& predictor, const bitstring* dcTable,
-                        const bitstring* acTable)
-{
-    const int diff = du[0] - predictor;
-    predictor = du[0];
-    PutCoded(dcTable, diff);
-
-    uint64_t ac = nonzero & ~uint64_t{1};
-    int previous = 0;
-    while (ac != 0) {
-        const int position = __builtin_ctzll(ac);
-        int zeros = position - previous - 1;
-        for (; zeros >= 16; zeros -= 16)
-            writer.Put(acTable[kSixteenZeros].value, acTable[kSixteenZeros].length);
-        PutCoded(acTable + zeros * 16, du[kNaturalOrder.at[position]]);
-        previous = position;
-        ac &= ac - 1;
+    // The Huffman code of the value's category among codes, then the value's extra bits.
+    void PutCoded(const bitstring* codes, int value)
+    {
+        const bitstring code = codes[category[value]];
+        const bitstring extra = bitcode[value];
+        cursor.Put((uint32_t{code.value} << extra.length) | extra.value, code.length + extra.length);
     }
-    if (previous != 63)
-        writer.Put(acTable[kEndOfBlock].value, acTable[kEndOfBlock].length);
-}
+
+    void PutCode(const bitstring& code) { cursor.Put(code.value, code.length); }
+
+    // du: quantised coefficients in natural order; nonzero: bit k set when zigzag position k is
+    // not 0. The DC codes its difference from the predictor (a difference of 0 is category 0
+    // with no extra bits); each nonzero AC value codes the run of zeros before it, in whole runs
+    // of sixteen first; an end-of-block code follows unless the last position is nonzero.
+    void Code(const short* du, uint64_t nonzero, int& predictor, const bitstring* dcTable, const bitstring* acTable)
+    {
+        const int diff = du[0] - predictor;
+        predictor = du[0];
+        PutCoded(dcTable, diff);
+
+        uint64_t ac = nonzero & ~uint64_t{1};
+        int previous = 0;
+        while (ac != 0) {
+            const int position = __builtin_ctzll(ac);
+            int zeros = position - previous - 1;
+            for (; zeros >= 16; zeros -= 16)
+                PutCode(acTable[kSixteenZeros]);
+            PutCoded(acTable + zeros * 16, du[kNaturalOrder.at[position]]);
+            previous = position;
+            ac &= ac - 1;
+        }
+        if (previous != 63)
+            PutCode(acTable[kEndOfBlock]);
+    }
+};
+
+// A block codes at most 2021 bits (DC 31, 63 AC values of 31 each, three runs of sixteen zeros
+// of 11, end of block 4); with up to 63 bits pending before it, at most 32 words leave, each
+// eight bytes possibly stuffed.
+constexpr size_t kMostBytesPerBlock = 32 * 16;
 
 // Interleaved scan: one block of Y, Cb and Cr per minimum coded unit, no restart markers.
 // Colour conversion and transforms run over a whole row of blocks before it is coded.
@@ -410,11 +355,14 @@ void Encoder::MainEncoder()
         transform(y.samples.data(), blocks, fdtbl_Y, y.coefficients.data(), y.nonzero.data());
         transform(cb.samples.data(), blocks, fdtbl_Cb, cb.coefficients.data(), cb.nonzero.data());
         transform(cr.samples.data(), blocks, fdtbl_Cb, cr.coefficients.data(), cr.nonzero.data());
+        BlockCoder coder{categoryTable.data() + kLargestMagnitude, bitcodeTable.data() + kLargestMagnitude,
+                         writer.Begin(3 * kMostBytesPerBlock * size_t(blocks))};
         for (int b = 0; b < blocks; ++b) {
-            CodeBlock(&y.coefficients[64 * size_t(b)], y.nonzero[b], predictorY, YDC_HT, YAC_HT);
-            CodeBlock(&cb.coefficients[64 * size_t(b)], cb.nonzero[b], predictorCb, CbDC_HT, CbAC_HT);
-            CodeBlock(&cr.coefficients[64 * size_t(b)], cr.nonzero[b], predictorCr, CbDC_HT, CbAC_HT);
+            coder.Code(&y.coefficients[64 * size_t(b)], y.nonzero[b], predictorY, YDC_HT, YAC_HT);
+            coder.Code(&cb.coefficients[64 * size_t(b)], cb.nonzero[b], predictorCb, CbDC_HT, CbAC_HT);
+            coder.Code(&cr.coefficients[64 * size_t(b)], cr.nonzero[b], predictorCr, CbDC_HT, CbAC_HT);
         }
+        writer.End(coder.cursor);
     }
 }
 
@@ -600,7 +548,10 @@ void main_encoder()
 void writebits(bitstring bits)
 {
     std::lock_guard<std::mutex> lock(encoderMutex);
-    encoder.WriteBits(bits);
+    try {
+        encoder.WriteBits(bits);
+    } catch (const std::bad_alloc&) {
+    }
     encoder.writer.DropBytes();
 }
 
