@@ -168,11 +168,13 @@ void PaintYuv(MEDIA_FRAME* picture)
     std::mt19937 grain(3);
     for (int y = 0; y < kHeight; ++y)
         for (int x = 0; x < kWidth; ++x)
-            picture->plane[0][y * picture->pitch[0] + x] = static_cast<unsigned char>(16 + Scene(x, y, 1, grain) * 219 / 255);
+            picture->plane[0][y * picture->pitch[0] + x] =
+                static_cast<unsigned char>(16 + Scene(x, y, 1, grain) * 219 / 255);
     for (int y = 0; y < kHeight / 2; ++y) {
         for (int x = 0; x < kWidth / 2; ++x) {
-            picture->plane[1][y * picture->pitch[1] + x] = static_cast<unsigned char>(64 + Scene(2 * x, 2 * y, 0, grain) / 2);
-            picture->plane[2][y * picture->pitch[2] + x] = static_cast<unsigned char>(64 + Scene(2 * x, 2 * y, 2, grain) / 2);
+            const int u = 64 + Scene(2 * x, 2 * y, 0, grain) / 2, v = 64 + Scene(2 * x, 2 * y, 2, grain) / 2;
+            picture->plane[1][y * picture->pitch[1] + x] = static_cast<unsigned char>(u);
+            picture->plane[2][y * picture->pitch[2] + x] = static_cast<unsigned char>(v);
         }
     }
 }

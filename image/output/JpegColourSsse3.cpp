@@ -66,9 +66,12 @@ Samples ConvertFour(__m128i bytes, int half, const Constants& k)
     const __m128i redGreen = _mm_shuffle_epi8(bytes, k.redGreen[half]);
     const __m128i blueGreen = _mm_shuffle_epi8(bytes, k.blueGreen[half]);
     const __m128i redBlue = _mm_shuffle_epi8(bytes, k.redBlue[half]);
-    const __m128i y = _mm_add_epi32(_mm_madd_epi16(redGreen, k.yFromRedGreen), _mm_madd_epi16(blueGreen, k.yFromBlueGreen));
-    const __m128i cb = _mm_add_epi32(_mm_madd_epi16(blueGreen, k.cbFromBlueGreen), _mm_madd_epi16(redBlue, k.cbFromRedBlue));
-    const __m128i cr = _mm_add_epi32(_mm_madd_epi16(redGreen, k.crFromRedGreen), _mm_madd_epi16(redBlue, k.crFromRedBlue));
+    const __m128i y =
+        _mm_add_epi32(_mm_madd_epi16(redGreen, k.yFromRedGreen), _mm_madd_epi16(blueGreen, k.yFromBlueGreen));
+    const __m128i cb =
+        _mm_add_epi32(_mm_madd_epi16(blueGreen, k.cbFromBlueGreen), _mm_madd_epi16(redBlue, k.cbFromRedBlue));
+    const __m128i cr =
+        _mm_add_epi32(_mm_madd_epi16(redGreen, k.crFromRedGreen), _mm_madd_epi16(redBlue, k.crFromRedBlue));
     return {_mm_sub_epi32(_mm_srai_epi32(y, 16), k.levelShift), _mm_srai_epi32(cb, 16), _mm_srai_epi32(cr, 16)};
 }
 

@@ -11,7 +11,6 @@
 //      functions around the lock
 #include "image/output/JpegEncoder.h"
 
-#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
@@ -126,7 +125,7 @@ constexpr size_t kMaxPathBytes = 511;  // the paths' buffers hold 512 bytes with
 
 // One component of a row of blocks: its samples, quantised coefficients and nonzero masks.
 struct ComponentRow {
-    explicit ComponentRow(int blocks) : samples(64 * size_t(blocks)), coefficients(64 * size_t(blocks)), nonzero(size_t(blocks)) {}
+    explicit ComponentRow(size_t blocks) : samples(64 * blocks), coefficients(64 * blocks), nonzero(blocks) {}
     std::vector<signed char> samples;
     std::vector<short> coefficients;
     std::vector<uint64_t> nonzero;
@@ -342,7 +341,7 @@ void Encoder::MainEncoder()
     if (!TablesBuilt() || !PictureLoaded())
         return;
     const int blocks = static_cast<int>(width / 8);
-    ComponentRow y(blocks), cb(blocks), cr(blocks);
+    ComponentRow y(width / 8), cb(width / 8), cr(width / 8);
     const avpost::jpeg::ColourBlockRowFunction convert = avpost::jpeg::PickColourBlockRow();
     const avpost::jpeg::TransformBlocksFunction transform = avpost::jpeg::PickTransformBlocks();
     const size_t rowBytes = size_t{width} * 3;
@@ -356,11 +355,11 @@ void Encoder::MainEncoder()
         transform(cb.samples.data(), blocks, fdtbl_Cb, cb.coefficients.data(), cb.nonzero.data());
         transform(cr.samples.data(), blocks, fdtbl_Cb, cr.coefficients.data(), cr.nonzero.data());
         BlockCoder coder{categoryTable.data() + kLargestMagnitude, bitcodeTable.data() + kLargestMagnitude,
-                         writer.Begin(3 * kMostBytesPerBlock * size_t(blocks))};
+                         writer.Begin(3 * kMostBytesPerBlock * (width / 8))};
         for (int b = 0; b < blocks; ++b) {
-            coder.Code(&y.coefficients[64 * size_t(b)], y.nonzero[b], predictorY, YDC_HT, YAC_HT);
-            coder.Code(&cb.coefficients[64 * size_t(b)], cb.nonzero[b], predictorCb, CbDC_HT, CbAC_HT);
-            coder.Code(&cr.coefficients[64 * size_t(b)], cr.nonzero[b], predictorCr, CbDC_HT, CbAC_HT);
+            coder.Code(&y.coefficients[64 * b], y.nonzero[b], predictorY, YDC_HT, YAC_HT);
+            coder.Code(&cb.coefficients[64 * b], cb.nonzero[b], predictorCb, CbDC_HT, CbAC_HT);
+            coder.Code(&cr.coefficients[64 * b], cr.nonzero[b], predictorCr, CbDC_HT, CbAC_HT);
         }
         writer.End(coder.cursor);
     }

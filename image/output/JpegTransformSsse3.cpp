@@ -113,7 +113,8 @@ void TransformBlocksSsse3(const signed char* samples, int blockCount, const floa
         AanDctPass(right, 1);
         __m128i rows[8];
         for (int r = 0; r < 8; ++r) {
-            rows[r] = _mm_packs_epi32(QuantizeFour(left[r], divisors + 8 * r), QuantizeFour(right[r], divisors + 8 * r + 4));
+            rows[r] = _mm_packs_epi32(QuantizeFour(left[r], divisors + 8 * r),
+                                      QuantizeFour(right[r], divisors + 8 * r + 4));
             _mm_storeu_si128(reinterpret_cast<__m128i*>(coefficients + 8 * r), rows[r]);
         }
         nonzero[block] = NonzeroMask(rows);

@@ -65,7 +65,8 @@ Transformed Active(const signed char* samples, int blocks, const float* divisors
 // The divisors a conversion uses: 1 / (q x a[row] x a[col] x 8) for quantisers q from 5 to 50.
 std::vector<float> EncoderLikeDivisors(std::mt19937& random)
 {
-    constexpr double scale[8] = {1.0, 1.387039845, 1.306562965, 1.175875602, 1.0, 0.785694958, 0.541196100, 0.275899379};
+    constexpr double scale[8] = {1.0,         1.387039845, 1.306562965, 1.175875602,
+                                 1.0,         0.785694958, 0.541196100, 0.275899379};
     std::vector<float> divisors(64);
     for (int i = 0; i < 64; ++i)
         divisors[i] = static_cast<float>(1.0 / ((5 + random() % 46) * scale[i / 8] * scale[i % 8] * 8.0));
@@ -85,8 +86,8 @@ TEST(JpegTransform, EveryVariantMatchesTheReference)
                 const int amplitude = 1 << (random() % 9);
                 const int centre = static_cast<int>(random() % 256) - 128;
                 for (int i = 0; i < 64; ++i) {
-                    const int value = b == 0 && blocks > 1 ? (offset % 2 == 0 ? -128 : 127)
-                                                           : centre + static_cast<int>(random() % amplitude) - amplitude / 2;
+                    const int noise = centre + static_cast<int>(random() % amplitude) - amplitude / 2;
+                    const int value = b == 0 && blocks > 1 ? (offset % 2 == 0 ? -128 : 127) : noise;
                     samples[64 * b + i] = static_cast<signed char>(value < -128 ? -128 : value > 127 ? 127 : value);
                 }
             }
