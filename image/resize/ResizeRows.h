@@ -1,0 +1,69 @@
+#ifndef AVPOST_IMAGE_RESIZE_RESIZEROWS_H
+#define AVPOST_IMAGE_RESIZE_RESIZEROWS_H
+
+#include <cstdint>
+
+// The row contract of the vector resize kernels. A kernel works out once per call which source
+// bytes every output byte of a row reads (a column plan), then walks the rows handing each one
+// to these functions; each instruction set implements them in a file of its own
+// (ResizeRows<Isa>.cpp). Plain declarations only: those files share no code with the others.
+//
+// Every function writes exactly `count` output bytes and reads source bytes only inside the
+// plan's windows, which lie inside the bytes the reference kernel reads.
+namespace avpost::detail {
+
+// Output bytes a plan serves per block; each block reads one 16-byte window of the source row.
+constexpr int kPlanBlock = 8;
+constexpr int kPlanWindow = 16;
+
+// A nearest-neighbour row: out[o] = row[index[o]]. Block k takes output bytes 8k ... 8k + 7
+// from the window at row + windows[k]: out[8k + j] = window[picks[16k + j]] (picks 8 ... 15 of
+// a block are 0x80, giving 0).
+struct GatherPlan {
+    int32_t count;
+    const int32_t* index;
+    const uint8_t* picks;    // null when some block's bytes do not fit one window
+    const int32_t* windows;
+};
+
+// A horizontally blended row: out[o] = row[a[o]] + (((row[b[o]] - row[a[o]]) x w[o]) >> 12),
+// which equals (row[a] x (4096 - w) + row[b] x w) >> 12 with an arithmetic shift. Block k reads
+// the window at row + windows[k]: picksA[16k + 2j] is the offset of a for output 8k + j and
+// picksB likewise for b (odd bytes 0x80, so each pick yields a 16-bit word); eightfold[8k + j]
+// is 8 x w, so that the high half of 2 (b - a) x 8w is (b - a) x w >> 12.
+struct BlendPlan {
+    int32_t count;
+    const int32_t* a;
+    const int32_t* b;
+    const int16_t* w;
+    const uint8_t* picksA;   // null when some block's bytes do not fit one window
+    const uint8_t* picksB;
+    const int16_t* eightfold;
+    const int32_t* windows;
+};
+
+// A vertical blend of two rows: out[o] = upper[o] + (((lower[o] - upper[o]) x w) >> 12) with
+// w = eightfold[o % 8] / 8, so that a 32-bit pixel can keep its fourth byte (weight 0). upper
+// and lower may be read up to 32 bytes past count.
+using BlendRowsFunction = void (*)(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold,
+                                   uint8_t* out, int32_t count);
+using GatherFunction = void (*)(const uint8_t* row, const GatherPlan& plan, uint8_t* out);
+using BlendColumnsFunction = void (*)(const uint8_t* row, const BlendPlan& plan, uint8_t* out);
+
+// What one instruction set offers; a null column function means the plan's plain tables serve.
+struct ResizeRowSet {
+    GatherFunction gather;
+    BlendColumnsFunction blendColumns;
+    BlendRowsFunction blendRows;
+};
+
+extern const ResizeRowSet kResizeRowsSse2;
+extern const ResizeRowSet kResizeRowsSsse3;
+extern const ResizeRowSet kResizeRowsAvx2;
+
+void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out,
+                   int32_t count);
+
+}  // namespace avpost::detail
+
+#endif
