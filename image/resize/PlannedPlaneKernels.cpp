@@ -4,6 +4,7 @@
 #include "image/resize/PlaneRows.h"
 #include "image/resize/PlannedKernels.h"
 #include "image/resize/PlannedRows.h"
+#include "image/resize/ResizeCoverage.h"
 
 namespace avpost::detail {
 namespace {
@@ -36,11 +37,10 @@ BlendPlan LumaBlend(BlendTable& table, int32_t stepX, int32_t count, int32_t src
 
 // Chroma sample m sits at luma column dst.x + 2m and reads luma position m x 2 stepX; offsets
 // count from the chroma column of the source rectangle's left edge.
-int32_t ChromaCount(const IMG_PARAM& dst) { return (dst.cx + 1) / 2; }
 
 GatherPlan ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
 {
-    const int32_t count = ChromaCount(dst);
+    const int32_t count = ChromaWrittenArea(dst).columns;
     table.index.resize(static_cast<size_t>(count));
     const int64_t stride = 2 * static_cast<int64_t>(stepX);
     int64_t fx = 0;
@@ -51,7 +51,7 @@ GatherPlan ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PAR
 
 BlendPlan ChromaBlend(BlendTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
 {
-    const int32_t count = ChromaCount(dst);
+    const int32_t count = ChromaWrittenArea(dst).columns;
     table.Resize(count);
     const int64_t stride = 2 * static_cast<int64_t>(stepX);
     int64_t fx = 0;
@@ -64,9 +64,8 @@ BlendPlan ChromaBlend(BlendTable& table, const IMG_PARAM& src, const IMG_PARAM& 
     return table.Plan();
 }
 
-// The chroma rows the walk writes: one per two luma rows while yy < dst.y + dst.cy - 2, then
-// the row where it stops, which copies the source's last chroma row.
-int32_t ChromaInnerRows(const IMG_PARAM& dst) { return (dst.cy - 1) / 2; }
+// The chroma rows before the last, which copies the source's last chroma row.
+int32_t ChromaInnerRows(const IMG_PARAM& dst) { return ChromaWrittenArea(dst).rows - 1; }
 
 }  // namespace
 
