@@ -9,6 +9,7 @@ namespace {
 
 constexpr uint8_t kZeroByte = 0x80;  // a shuffle control byte that yields 0
 constexpr int32_t kNoWindow = -1;
+constexpr int32_t kPairRun = 16;  // the pairs run on to a multiple of this many outputs
 
 // Blocks of a plan of count bytes, plus the spare one the vector rows may read as a pair's second.
 int32_t BlockCount(int32_t count) { return (count + kPlanBlock - 1) / kPlanBlock; }
@@ -71,6 +72,26 @@ void FillPicks(uint8_t* picks, int32_t stride, const Block& block, int32_t windo
         picks[(o - block.begin) * stride] = static_cast<uint8_t>(offset(o) - window);
 }
 
+// Output o as a blend of the neighbours p and p + 1 inside the bytes the plan reads, [first,
+// last]: false when its bytes are not neighbours, or when a blend of a byte with itself finds
+// no neighbour there.
+bool AsPair(int32_t a, int32_t b, int32_t w, int32_t first, int32_t last, int32_t& p, int16_t weights[2])
+{
+    if (b == a + 1 || (b == a && a < last)) {
+        p = a;
+        weights[0] = static_cast<int16_t>(kFixedOne - (b == a ? 0 : w));
+        weights[1] = static_cast<int16_t>(b == a ? 0 : w);
+        return true;
+    }
+    if (b == a && a > first) {
+        p = a - 1;
+        weights[0] = 0;
+        weights[1] = static_cast<int16_t>(kFixedOne);
+        return true;
+    }
+    return false;
+}
+
 }  // namespace
 
 GatherPlan GatherTable::Plan()
@@ -98,10 +119,32 @@ void BlendTable::Resize(int32_t count)
     w.resize(static_cast<size_t>(count));
 }
 
+bool BlendTable::MakePairs()
+{
+    const auto count = static_cast<int32_t>(a.size());
+    if (count == 0)
+        return false;
+    const auto [lowA, highA] = std::minmax_element(a.begin(), a.end());
+    const auto [lowB, highB] = std::minmax_element(b.begin(), b.end());
+    const int32_t first = std::min(*lowA, *lowB), last = std::max(*highA, *highB);
+    const int32_t run = (count + kPairRun - 1) / kPairRun * kPairRun;
+    pairs_.resize(static_cast<size_t>(run));
+    pairWeights_.assign(2 * static_cast<size_t>(run), 0);
+    for (int32_t o = 0; o < count; ++o)
+        if (!AsPair(a[o], b[o], w[o], first, last, pairs_[o], &pairWeights_[2 * static_cast<size_t>(o)]))
+            return false;
+    std::fill(pairs_.begin() + count, pairs_.end(), pairs_[count - 1]);
+    return true;
+}
+
 BlendPlan BlendTable::Plan()
 {
     const auto count = static_cast<int32_t>(a.size());
-    BlendPlan plan{count, a.data(), b.data(), w.data(), nullptr, nullptr, nullptr, nullptr};
+    BlendPlan plan{count, a.data(), b.data(), w.data(), nullptr, nullptr, nullptr, nullptr, nullptr, nullptr};
+    if (MakePairs()) {
+        plan.pairs = pairs_.data();
+        plan.pairWeights = pairWeights_.data();
+    }
     const bool windowed = MakeWindows(
         count,
         [this](int32_t o, int32_t& low, int32_t& high) {
@@ -130,16 +173,20 @@ BlendPlan BlendTable::Plan()
     return plan;
 }
 
+// The tables are taken into locals: a byte written through out might otherwise be the plan.
 void GatherByIndex(const uint8_t* row, const GatherPlan& plan, uint8_t* out)
 {
-    for (int32_t o = 0; o < plan.count; ++o)
-        out[o] = row[plan.index[o]];
+    const int32_t* index = plan.index;
+    for (int32_t o = 0, count = plan.count; o < count; ++o)
+        out[o] = row[index[o]];
 }
 
 void BlendByIndex(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
 {
-    for (int32_t o = 0; o < plan.count; ++o)
-        out[o] = static_cast<uint8_t>(Lerp(row[plan.a[o]], row[plan.b[o]], plan.w[o]));
+    const int32_t *a = plan.a, *b = plan.b;
+    const int16_t* w = plan.w;
+    for (int32_t o = 0, count = plan.count; o < count; ++o)
+        out[o] = static_cast<uint8_t>(Lerp(row[a[o]], row[b[o]], w[o]));
 }
 
 }  // namespace avpost::detail

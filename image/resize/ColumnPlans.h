@@ -34,10 +34,14 @@ public:
     BlendPlan Plan();
 
 private:
+    bool MakePairs();
+
     std::vector<uint8_t> picksA_;
     std::vector<uint8_t> picksB_;
     std::vector<int16_t> eightfold_;
     std::vector<int32_t> windows_;
+    std::vector<int32_t> pairs_;
+    std::vector<int16_t> pairWeights_;
 };
 
 // The plans run through the plain tables: for plans without windows and for instruction sets

@@ -15,6 +15,8 @@ void BlendColumns(const ResizeRowSet& set, const BlendPlan& plan, const uint8_t*
 {
     if (set.blendColumns != nullptr && plan.picksA != nullptr)
         set.blendColumns(row, plan, out);
+    else if (set.blendPairs != nullptr && plan.pairs != nullptr)
+        set.blendPairs(row, plan, out);
     else
         BlendByIndex(row, plan, out);
 }

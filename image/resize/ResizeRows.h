@@ -31,6 +31,11 @@ struct GatherPlan {
 // the window at row + windows[k]: picksA[16k + 2j] is the offset of a for output 8k + j and
 // picksB likewise for b (odd bytes 0x80, so each pick yields a 16-bit word); eightfold[8k + j]
 // is 8 x w, so that the high half of 2 (b - a) x 8w is (b - a) x w >> 12.
+//
+// Where every output blends two neighbouring bytes the plan also has pairs: output o is
+// (row[p] x pairWeights[2o] + row[p + 1] x pairWeights[2o + 1]) >> 12 with p = pairs[o], the
+// same value (a blend of a byte with itself is that byte, weight 0 or 4096 on it). The pairs run
+// on to a multiple of 16 outputs, repeating the last pair with weights 0.
 struct BlendPlan {
     int32_t count;
     const int32_t* a;
@@ -40,6 +45,8 @@ struct BlendPlan {
     const uint8_t* picksB;
     const int16_t* eightfold;
     const int32_t* windows;
+    const int32_t* pairs;    // null when some output's bytes are not neighbours
+    const int16_t* pairWeights;
 };
 
 // A vertical blend of two rows: out[o] = upper[o] + (((lower[o] - upper[o]) x w) >> 12) with
@@ -51,9 +58,11 @@ using GatherFunction = void (*)(const uint8_t* row, const GatherPlan& plan, uint
 using BlendColumnsFunction = void (*)(const uint8_t* row, const BlendPlan& plan, uint8_t* out);
 
 // What one instruction set offers; a null column function means the plan's plain tables serve.
+// blendColumns runs a plan's windows, blendPairs its pairs.
 struct ResizeRowSet {
     GatherFunction gather;
     BlendColumnsFunction blendColumns;
+    BlendColumnsFunction blendPairs;
     BlendRowsFunction blendRows;
 };
 
@@ -61,6 +70,7 @@ extern const ResizeRowSet kResizeRowsSse2;
 extern const ResizeRowSet kResizeRowsSsse3;
 extern const ResizeRowSet kResizeRowsAvx2;
 
+void BlendPairsSse2(const uint8_t* row, const BlendPlan& plan, uint8_t* out);
 void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out,
                    int32_t count);
 

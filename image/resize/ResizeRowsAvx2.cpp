@@ -102,6 +102,6 @@ void BlendRowsAvx2(const uint8_t* upper, const uint8_t* lower, const int16_t* ei
 
 }  // namespace
 
-extern const ResizeRowSet kResizeRowsAvx2 = {GatherAvx2, BlendColumnsAvx2, BlendRowsAvx2};
+extern const ResizeRowSet kResizeRowsAvx2 = {GatherAvx2, BlendColumnsAvx2, BlendPairsSse2, BlendRowsAvx2};
 
 }  // namespace avpost::detail

@@ -1,5 +1,5 @@
-// The vertical blend with SSE2; the column work stays with the plan's plain tables, as SSE2 has
-// no byte shuffle.
+// Row work with SSE2, which has no byte shuffle: the column blend from the plan's pairs (one
+// 16-bit load per output), and the vertical blend.
 #include <emmintrin.h>
 
 #include "image/resize/ResizeRows.h"
@@ -21,7 +21,46 @@ __m128i BlendSixteen(__m128i upper, __m128i lower, __m128i eightfold)
     return _mm_packus_epi16(low, high);
 }
 
+void StoreFirst(__m128i bytes, uint8_t* out, int32_t count)
+{
+    alignas(16) uint8_t all[16];
+    _mm_store_si128(reinterpret_cast<__m128i*>(all), bytes);
+    for (int32_t k = 0; k < count; ++k)
+        out[k] = all[k];
+}
+
+short Pair(const uint8_t* row, int32_t at)
+{
+    short pair;
+    __builtin_memcpy(&pair, row + at, sizeof pair);
+    return pair;
+}
+
+// Outputs o ... o + 7 as 16-bit words: (first x w0 + second x w1) >> 12 per pair.
+__m128i BlendEightPairs(const uint8_t* row, const BlendPlan& plan, int32_t o)
+{
+    const int32_t* p = plan.pairs + o;
+    const __m128i pairs = _mm_set_epi16(Pair(row, p[7]), Pair(row, p[6]), Pair(row, p[5]), Pair(row, p[4]),
+                                        Pair(row, p[3]), Pair(row, p[2]), Pair(row, p[1]), Pair(row, p[0]));
+    const __m128i zero = _mm_setzero_si128();
+    const __m128i* weights = reinterpret_cast<const __m128i*>(plan.pairWeights + 2 * o);
+    const __m128i low = _mm_madd_epi16(_mm_unpacklo_epi8(pairs, zero), _mm_loadu_si128(weights));
+    const __m128i high = _mm_madd_epi16(_mm_unpackhi_epi8(pairs, zero), _mm_loadu_si128(weights + 1));
+    return _mm_packs_epi32(_mm_srli_epi32(low, 12), _mm_srli_epi32(high, 12));
+}
+
 }  // namespace
+
+void BlendPairsSse2(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
+{
+    for (int32_t o = 0; o < plan.count; o += 16) {
+        const __m128i bytes = _mm_packus_epi16(BlendEightPairs(row, plan, o), BlendEightPairs(row, plan, o + 8));
+        if (o + 16 <= plan.count)
+            _mm_storeu_si128(reinterpret_cast<__m128i*>(out + o), bytes);
+        else
+            StoreFirst(bytes, out + o, plan.count - o);
+    }
+}
 
 void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out, int32_t count)
 {
@@ -32,16 +71,13 @@ void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* ei
         const __m128i l = _mm_loadu_si128(reinterpret_cast<const __m128i*>(lower + o));
         _mm_storeu_si128(reinterpret_cast<__m128i*>(out + o), BlendSixteen(u, l, weights));
     }
-    if (o == count)
-        return;
-    alignas(16) uint8_t last[16];
-    const __m128i u = _mm_loadu_si128(reinterpret_cast<const __m128i*>(upper + o));
-    const __m128i l = _mm_loadu_si128(reinterpret_cast<const __m128i*>(lower + o));
-    _mm_store_si128(reinterpret_cast<__m128i*>(last), BlendSixteen(u, l, weights));
-    for (int32_t k = 0; o + k < count; ++k)
-        out[o + k] = last[k];
+    if (o < count) {
+        const __m128i u = _mm_loadu_si128(reinterpret_cast<const __m128i*>(upper + o));
+        const __m128i l = _mm_loadu_si128(reinterpret_cast<const __m128i*>(lower + o));
+        StoreFirst(BlendSixteen(u, l, weights), out + o, count - o);
+    }
 }
 
-extern const ResizeRowSet kResizeRowsSse2 = {nullptr, nullptr, BlendRowsSse2};
+extern const ResizeRowSet kResizeRowsSse2 = {nullptr, nullptr, BlendPairsSse2, BlendRowsSse2};
 
 }  // namespace avpost::detail

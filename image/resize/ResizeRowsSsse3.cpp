@@ -58,6 +58,6 @@ void BlendColumnsSsse3(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
 
 }  // namespace
 
-extern const ResizeRowSet kResizeRowsSsse3 = {GatherSsse3, BlendColumnsSsse3, BlendRowsSse2};
+extern const ResizeRowSet kResizeRowsSsse3 = {GatherSsse3, BlendColumnsSsse3, BlendPairsSse2, BlendRowsSse2};
 
 }  // namespace avpost::detail
