@@ -35,7 +35,7 @@ Block BlockAt(int32_t k, int32_t count) { return {k * kPlanBlock, std::min(count
 // Windows of every block from the bytes it reads (reads(o, low, high) widens [low, high] by
 // what output o reads), the spare block repeating the last; false when one does not fit.
 template <typename Reads>
-bool MakeWindows(int32_t count, Reads reads, std::vector<int32_t>& windows)
+bool FitWindows(int32_t count, Reads reads, std::vector<int32_t>& windows)
 {
     if (count == 0)
         return false;
@@ -94,22 +94,25 @@ bool AsPair(int32_t a, int32_t b, int32_t w, int32_t first, int32_t last, int32_
 
 }  // namespace
 
-GatherPlan GatherTable::Plan()
+GatherPlan GatherTable::Plan(const ResizeRowSet& set)
 {
     const auto count = static_cast<int32_t>(index.size());
-    GatherPlan plan{count, index.data(), nullptr, nullptr};
-    const bool windowed = MakeWindows(
-        count, [this](int32_t o, int32_t& low, int32_t& high) { Widen(index[o], low, high); }, windows_);
-    if (!windowed)
-        return plan;
-    const int32_t blocks = BlockCount(count);
-    picks_.assign(static_cast<size_t>(blocks + 1) * kPlanWindow, kZeroByte);
-    for (int32_t k = 0; k < blocks; ++k)
-        FillPicks(&picks_[static_cast<size_t>(k) * kPlanWindow], 1, BlockAt(k, count), windows_[k],
-                  [this](int32_t o) { return index[o]; });
-    plan.picks = picks_.data();
-    plan.windows = windows_.data();
-    return plan;
+    if (plannedFor_ != &set || index != plannedIndex_) {
+        plannedIndex_ = index;
+        plannedFor_ = &set;
+        windowed_ = set.gather != nullptr &&
+                    FitWindows(
+                        count, [this](int32_t o, int32_t& low, int32_t& high) { Widen(index[o], low, high); },
+                        windows_);
+        if (windowed_) {
+            const int32_t blocks = BlockCount(count);
+            picks_.assign(static_cast<size_t>(blocks + 1) * kPlanWindow, kZeroByte);
+            for (int32_t k = 0; k < blocks; ++k)
+                FillPicks(&picks_[static_cast<size_t>(k) * kPlanWindow], 1, BlockAt(k, count), windows_[k],
+                          [this](int32_t o) { return index[o]; });
+        }
+    }
+    return {count, index.data(), windowed_ ? picks_.data() : nullptr, windowed_ ? windows_.data() : nullptr};
 }
 
 void BlendTable::Resize(int32_t count)
@@ -117,6 +120,38 @@ void BlendTable::Resize(int32_t count)
     a.resize(static_cast<size_t>(count));
     b.resize(static_cast<size_t>(count));
     w.resize(static_cast<size_t>(count));
+}
+
+bool BlendTable::Planned(const ResizeRowSet& set) const
+{
+    return plannedFor_ == &set && a == plannedA_ && b == plannedB_ && w == plannedW_;
+}
+
+bool BlendTable::MakeWindows()
+{
+    const auto count = static_cast<int32_t>(a.size());
+    const bool windowed = FitWindows(
+        count,
+        [this](int32_t o, int32_t& low, int32_t& high) {
+            Widen(a[o], low, high);
+            Widen(b[o], low, high);
+        },
+        windows_);
+    if (!windowed)
+        return false;
+    const int32_t blocks = BlockCount(count);
+    picksA_.assign(static_cast<size_t>(blocks + 1) * kPlanWindow, kZeroByte);
+    picksB_.assign(picksA_.size(), kZeroByte);
+    eightfold_.assign(static_cast<size_t>(blocks + 1) * kPlanBlock, 0);
+    for (int32_t k = 0; k < blocks; ++k) {
+        const Block block = BlockAt(k, count);
+        const size_t at = static_cast<size_t>(k) * kPlanWindow;
+        FillPicks(&picksA_[at], 2, block, windows_[k], [this](int32_t o) { return a[o]; });
+        FillPicks(&picksB_[at], 2, block, windows_[k], [this](int32_t o) { return b[o]; });
+        for (int32_t o = block.begin; o < block.end; ++o)
+            eightfold_[o] = static_cast<int16_t>(8 * w[o]);
+    }
+    return true;
 }
 
 bool BlendTable::MakePairs()
@@ -137,43 +172,31 @@ bool BlendTable::MakePairs()
     return true;
 }
 
-BlendPlan BlendTable::Plan()
+BlendPlan BlendTable::Plan(const ResizeRowSet& set)
 {
-    const auto count = static_cast<int32_t>(a.size());
-    BlendPlan plan{count, a.data(), b.data(), w.data(), nullptr, nullptr, nullptr, nullptr, nullptr, nullptr};
-    if (MakePairs()) {
+    if (!Planned(set)) {
+        plannedA_ = a;
+        plannedB_ = b;
+        plannedW_ = w;
+        plannedFor_ = &set;
+        windowed_ = set.blendColumns != nullptr && MakeWindows();
+        paired_ = !windowed_ && set.blendPairs != nullptr && MakePairs();
+    }
+    BlendPlan plan{static_cast<int32_t>(a.size()), a.data(), b.data(), w.data(), nullptr, nullptr, nullptr, nullptr,
+                   nullptr, nullptr};
+    if (windowed_) {
+        plan.picksA = picksA_.data();
+        plan.picksB = picksB_.data();
+        plan.eightfold = eightfold_.data();
+        plan.windows = windows_.data();
+    }
+    if (paired_) {
         plan.pairs = pairs_.data();
         plan.pairWeights = pairWeights_.data();
     }
-    const bool windowed = MakeWindows(
-        count,
-        [this](int32_t o, int32_t& low, int32_t& high) {
-            Widen(a[o], low, high);
-            Widen(b[o], low, high);
-        },
-        windows_);
-    if (!windowed)
-        return plan;
-    const int32_t blocks = BlockCount(count);
-    picksA_.assign(static_cast<size_t>(blocks + 1) * kPlanWindow, kZeroByte);
-    picksB_.assign(picksA_.size(), kZeroByte);
-    eightfold_.assign(static_cast<size_t>(blocks + 1) * kPlanBlock, 0);
-    for (int32_t k = 0; k < blocks; ++k) {
-        const Block block = BlockAt(k, count);
-        const size_t at = static_cast<size_t>(k) * kPlanWindow;
-        FillPicks(&picksA_[at], 2, block, windows_[k], [this](int32_t o) { return a[o]; });
-        FillPicks(&picksB_[at], 2, block, windows_[k], [this](int32_t o) { return b[o]; });
-        for (int32_t o = block.begin; o < block.end; ++o)
-            eightfold_[o] = static_cast<int16_t>(8 * w[o]);
-    }
-    plan.picksA = picksA_.data();
-    plan.picksB = picksB_.data();
-    plan.eightfold = eightfold_.data();
-    plan.windows = windows_.data();
     return plan;
 }
 
-// The tables are taken into locals: a byte written through out might otherwise be the plan.
 void GatherByIndex(const uint8_t* row, const GatherPlan& plan, uint8_t* out)
 {
     const int32_t* index = plan.index;

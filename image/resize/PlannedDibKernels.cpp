@@ -22,19 +22,19 @@ void ForEachColumn(int32_t stepX, int32_t count, int32_t srcWidth, Column column
     column(count - 1, srcWidth - 1, 0);
 }
 
-GatherPlan Nearest(GatherTable& table, int32_t pixelBytes, int32_t stepX, int32_t count, int32_t srcWidth)
+GatherTable& Nearest(GatherTable& table, int32_t pixelBytes, int32_t stepX, int32_t count, int32_t srcWidth)
 {
     table.index.resize(static_cast<size_t>(count) * pixelBytes);
     ForEachColumn(stepX, count, srcWidth, [&](int32_t i, int32_t c, int32_t) {
         for (int32_t k = 0; k < pixelBytes; ++k)
             table.index[i * pixelBytes + k] = c * pixelBytes + k;
     });
-    return table.Plan();
+    return table;
 }
 
 // Colour bytes blend with the next column inside the rectangle; the fourth byte of a 32-bit
 // pixel and the whole last pixel are copied.
-BlendPlan Blend(BlendTable& table, int32_t pixelBytes, int32_t stepX, int32_t count, int32_t srcWidth)
+BlendTable& Blend(BlendTable& table, int32_t pixelBytes, int32_t stepX, int32_t count, int32_t srcWidth)
 {
     table.Resize(count * pixelBytes);
     ForEachColumn(stepX, count, srcWidth, [&](int32_t i, int32_t c, int32_t wx) {
@@ -47,13 +47,13 @@ BlendPlan Blend(BlendTable& table, int32_t pixelBytes, int32_t stepX, int32_t co
             table.w[o] = static_cast<int16_t>(blends ? wx : 0);
         }
     });
-    return table.Plan();
+    return table;
 }
 
 void NearestBottomUp(const ResizeRowSet& set, int32_t pixelBytes, const IMG_PARAM& src, const IMG_PARAM& dst)
 {
     const FixedSteps steps = StepsFor(src, dst);
-    const GatherPlan columns = Nearest(ThreadWorkspace().gather, pixelBytes, steps.x, dst.cx, src.cx);
+    const GatherPlan columns = Nearest(ThreadWorkspace().luma.gather, pixelBytes, steps.x, dst.cx, src.cx).Plan(set);
     const RowAddress from = BottomUpRows(src, src.x * pixelBytes);
     const RowAddress to = BottomUpRows(dst, dst.x * pixelBytes);
     int64_t fy = 0;
@@ -66,7 +66,7 @@ void BilinearBottomUp(const ResizeRowSet& set, int32_t pixelBytes, const IMG_PAR
 {
     ResizeWorkspace& workspace = ThreadWorkspace();
     const FixedSteps steps = StepsFor(src, dst);
-    const BlendPlan columns = Blend(workspace.blend, pixelBytes, steps.x, dst.cx, src.cx);
+    const BlendPlan columns = Blend(workspace.luma.blend, pixelBytes, steps.x, dst.cx, src.cx).Plan(set);
     const RowAddress from = BottomUpRows(src, src.x * pixelBytes);
     const RowAddress to = BottomUpRows(dst, dst.x * pixelBytes);
     HorizontalRows horizontal(set, columns, from, pixelBytes == kRgbaBytes, workspace.rows);
@@ -81,7 +81,7 @@ void BilinearBottomUp(const ResizeRowSet& set, int32_t pixelBytes, const IMG_PAR
         for (int32_t k = 0; k < pixelBytes; ++k)
             out[lastPixel + k] = upper[lastPixel + k];
     }
-    const GatherPlan nearest = Nearest(workspace.gather, pixelBytes, steps.x, dst.cx, src.cx);
+    const GatherPlan nearest = Nearest(workspace.luma.gather, pixelBytes, steps.x, dst.cx, src.cx).Plan(set);
     Gather(set, nearest, from.At(lastRow), to.At(dst.y + dst.cy - 1));
 }
 
@@ -104,11 +104,11 @@ void PlannedBiLiner8(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PA
 
 void PlannedNear8(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    GatherTable& table = ThreadWorkspace().gather;
+    GatherTable& table = ThreadWorkspace().luma.gather;
     table.index.resize(static_cast<size_t>(dst.cx));
     for (int32_t i = 0; i < dst.cx; ++i)
         table.index[i] = RoundedIndex(i, src.x, src.cx, dst.cx, src.nWidth) - src.x;
-    const GatherPlan columns = table.Plan();
+    const GatherPlan columns = table.Plan(set);
     const RowAddress from = TopDownRows(src, src.x);
     const RowAddress to = TopDownRows(dst, dst.x);
     for (int32_t j = 0; j < dst.cy; ++j)

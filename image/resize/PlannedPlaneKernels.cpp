@@ -12,17 +12,17 @@ namespace {
 int32_t Chroma(int32_t luma) { return luma / 2; }
 
 // Output i reads the source column at i x stepX from the rectangle's left edge.
-GatherPlan LumaNearest(GatherTable& table, int32_t stepX, int32_t count)
+GatherTable& LumaNearest(GatherTable& table, int32_t stepX, int32_t count)
 {
     table.index.resize(static_cast<size_t>(count));
     int64_t fx = 0;
     for (int32_t i = 0; i < count; ++i, fx += stepX)
         table.index[i] = WholePart(fx);
-    return table.Plan();
+    return table;
 }
 
 // Output i blends that column with the next one inside the rectangle.
-BlendPlan LumaBlend(BlendTable& table, int32_t stepX, int32_t count, int32_t srcWidth)
+BlendTable& LumaBlend(BlendTable& table, int32_t stepX, int32_t count, int32_t srcWidth)
 {
     table.Resize(count);
     int64_t fx = 0;
@@ -32,13 +32,13 @@ BlendPlan LumaBlend(BlendTable& table, int32_t stepX, int32_t count, int32_t src
         table.b[i] = NextWithin(c, srcWidth - 1);
         table.w[i] = static_cast<int16_t>(FractionPart(fx));
     }
-    return table.Plan();
+    return table;
 }
 
 // Chroma sample m sits at luma column dst.x + 2m and reads luma position m x 2 stepX; offsets
 // count from the chroma column of the source rectangle's left edge.
 
-GatherPlan ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
+GatherTable& ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
 {
     const int32_t count = ChromaWrittenArea(dst).columns;
     table.index.resize(static_cast<size_t>(count));
@@ -46,10 +46,10 @@ GatherPlan ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PAR
     int64_t fx = 0;
     for (int32_t m = 0; m < count; ++m, fx += stride)
         table.index[m] = Chroma(src.x + WholePart(fx)) - Chroma(src.x);
-    return table.Plan();
+    return table;
 }
 
-BlendPlan ChromaBlend(BlendTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
+BlendTable& ChromaBlend(BlendTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
 {
     const int32_t count = ChromaWrittenArea(dst).columns;
     table.Resize(count);
@@ -61,7 +61,7 @@ BlendPlan ChromaBlend(BlendTable& table, const IMG_PARAM& src, const IMG_PARAM& 
         table.b[m] = Chroma(NextWithin(c, LastColumn(src))) - Chroma(src.x);
         table.w[m] = static_cast<int16_t>(FractionPart(fx));
     }
-    return table.Plan();
+    return table;
 }
 
 // The chroma rows before the last, which copies the source's last chroma row.
@@ -72,7 +72,7 @@ int32_t ChromaInnerRows(const IMG_PARAM& dst) { return ChromaWrittenArea(dst).ro
 void PlannedNearY(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PARAM& dst)
 {
     const FixedSteps steps = StepsFor(src, dst);
-    const GatherPlan columns = LumaNearest(ThreadWorkspace().gather, steps.x, dst.cx);
+    const GatherPlan columns = LumaNearest(ThreadWorkspace().luma.gather, steps.x, dst.cx).Plan(set);
     const RowAddress from = TopDownRows(src, src.x);
     int64_t fy = 0;
     for (int32_t j = 0; j < dst.cy; ++j, fy += steps.y) {
@@ -86,7 +86,7 @@ void PlannedBiLinerY(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PA
 {
     ResizeWorkspace& workspace = ThreadWorkspace();
     const FixedSteps steps = StepsFor(src, dst);
-    const BlendPlan columns = LumaBlend(workspace.blend, steps.x, dst.cx, src.cx);
+    const BlendPlan columns = LumaBlend(workspace.luma.blend, steps.x, dst.cx, src.cx).Plan(set);
     const RowAddress from = TopDownRows(src, src.x);
     HorizontalRows horizontal(set, columns, from, false, workspace.rows);
     const int32_t lastRow = LastRow(src);
@@ -98,14 +98,14 @@ void PlannedBiLinerY(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PA
         PaintRowMargins(out, dst);
     }
     uint8_t* out = TopDownRow(dst, dst.y + dst.cy - 1);
-    Gather(set, LumaNearest(workspace.gather, steps.x, dst.cx), from.At(lastRow), out + dst.x);
+    Gather(set, LumaNearest(workspace.luma.gather, steps.x, dst.cx).Plan(set), from.At(lastRow), out + dst.x);
     PaintRowMargins(out, dst);
 }
 
 void PlannedNearUV(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_PARAM& dst)
 {
     const FixedSteps steps = StepsFor(src, dst);
-    const GatherPlan columns = ChromaNearest(ThreadWorkspace().gather, src, dst, steps.x);
+    const GatherPlan columns = ChromaNearest(ThreadWorkspace().chroma.gather, src, dst, steps.x).Plan(set);
     const RowAddress from = TopDownRows(src, Chroma(src.x));
     const RowAddress to = TopDownRows(dst, Chroma(dst.x));
     const int64_t stride = 2 * static_cast<int64_t>(steps.y);
@@ -120,7 +120,7 @@ void PlannedBiLinerUV(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_P
 {
     ResizeWorkspace& workspace = ThreadWorkspace();
     const FixedSteps steps = StepsFor(src, dst);
-    const BlendPlan columns = ChromaBlend(workspace.blend, src, dst, steps.x);
+    const BlendPlan columns = ChromaBlend(workspace.chroma.blend, src, dst, steps.x).Plan(set);
     const RowAddress from = TopDownRows(src, Chroma(src.x));
     const RowAddress to = TopDownRows(dst, Chroma(dst.x));
     HorizontalRows horizontal(set, columns, from, false, workspace.rows);
@@ -133,7 +133,7 @@ void PlannedBiLinerUV(const ResizeRowSet& set, const IMG_PARAM& src, const IMG_P
         horizontal.Blend(Chroma(r), Chroma(NextWithin(r, lastRow)), FractionPart(fy), to.At(Chroma(dst.y) + k),
                          columns.count);
     }
-    const GatherPlan nearest = ChromaNearest(workspace.gather, src, dst, steps.x);
+    const GatherPlan nearest = ChromaNearest(workspace.chroma.gather, src, dst, steps.x).Plan(set);
     Gather(set, nearest, from.At(Chroma(lastRow)), to.At(Chroma(dst.y) + inner));
 }
 

@@ -17,11 +17,18 @@ namespace avpost::detail {
 // where the reference kernels run.
 const ResizeRowSet* PlannedRowSet();
 
-// Tables kept per thread from call to call, so that resizing a picture of a size seen before
-// allocates nothing. Kernels run one at a time on a thread and call no other kernel.
-struct ResizeWorkspace {
+// The column tables of one kind of plane.
+struct PlanTables {
     GatherTable gather;
     BlendTable blend;
+};
+
+// Tables kept per thread from call to call, so that resizing a picture of a size seen before
+// allocates nothing and reuses its plans; luma (and the other kernels) and chroma keep theirs
+// apart. Kernels run one at a time on a thread and call no other kernel.
+struct ResizeWorkspace {
+    PlanTables luma;
+    PlanTables chroma;
     std::vector<uint8_t> rows;
 };
 ResizeWorkspace& ThreadWorkspace();

@@ -89,13 +89,19 @@ Bytes RunAt(Level level, const KernelCase& c, const IMG_PARAM& src, const Geomet
     return buffer.Contents();
 }
 
+Bytes RandomBytes(size_t count, std::mt19937& random)
+{
+    Bytes bytes(count);
+    std::generate(bytes.begin(), bytes.end(), [&] { return static_cast<unsigned char>(random()); });
+    return bytes;
+}
+
 // Runs one request at every level and compares with the scalar reference; false on a difference.
 bool SameAtEveryLevel(const KernelCase& c, const Geometry& from, const Geometry& to, unsigned seed)
 {
     std::mt19937 random(seed);
-    Bytes source(Span(c.layout, from, false)), before(Span(c.layout, to, true));
-    for (Bytes* bytes : {&source, &before})
-        std::generate(bytes->begin(), bytes->end(), [&] { return static_cast<unsigned char>(random()); });
+    Bytes source = RandomBytes(Span(c.layout, from, false), random);
+    const Bytes before = RandomBytes(Span(c.layout, to, true), random);
     const IMG_PARAM src = Describe(c.layout, from, source.data());
     const Bytes reference = RunAt(Level::kScalar, c, src, to, before);
     for (Level level : AvailableSimdLevels()) {
@@ -143,6 +149,31 @@ TEST(ResizeVariants, RandomPicturesAndRectangles)
             if (!SameAtEveryLevel(c, from, to, random()))
                 break;
         }
+    }
+}
+
+TEST(ResizeVariants, EachRequestGetsItsOwnPlan)
+{
+    // Plans are kept from call to call: requests of one destination size from other sources,
+    // run one after another at one level, must not take one another's.
+    struct Request {
+        Geometry from, to;
+        Bytes source, before, reference;
+    };
+    std::mt19937 random(77);
+    for (const KernelCase& c : kKernels) {
+        std::vector<Request> requests;
+        for (int n = 0; n < 16; ++n) {
+            Request r{RandomGeometry(random, 90, 12, 1), Whole(41, 7, n), {}, {}, {}};
+            r.source = RandomBytes(Span(c.layout, r.from, false), random);
+            r.before = RandomBytes(Span(c.layout, r.to, true), random);
+            r.reference = RunAt(Level::kScalar, c, Describe(c.layout, r.from, r.source.data()), r.to, r.before);
+            requests.push_back(std::move(r));
+        }
+        for (Level level : AvailableSimdLevels())
+            for (Request& r : requests)
+                EXPECT_EQ(RunAt(level, c, Describe(c.layout, r.from, r.source.data()), r.to, r.before), r.reference)
+                    << c.name << " at " << avpost::simd::NameOf(level) << " from " << Describe(r.from);
     }
 }
 
