@@ -11,7 +11,8 @@ constexpr uint8_t kZeroByte = 0x80;  // a shuffle control byte that yields 0
 constexpr int32_t kNoWindow = -1;
 constexpr int32_t kPairRun = 16;  // the pairs run on to a multiple of this many outputs
 
-// Blocks of a plan of count bytes, plus the spare one the vector rows may read as a pair's second.
+// Blocks of a plan of count bytes; the tables keep a spare one after them, which the vector rows
+// may read as the second of a pair of blocks.
 int32_t BlockCount(int32_t count) { return (count + kPlanBlock - 1) / kPlanBlock; }
 
 // The bytes a plan reads lie in [first, last]. A block reading [low, high] gets the 16 bytes from

@@ -37,7 +37,6 @@ BlendTable& LumaBlend(BlendTable& table, int32_t stepX, int32_t count, int32_t s
 
 // Chroma sample m sits at luma column dst.x + 2m and reads luma position m x 2 stepX; offsets
 // count from the chroma column of the source rectangle's left edge.
-
 GatherTable& ChromaNearest(GatherTable& table, const IMG_PARAM& src, const IMG_PARAM& dst, int32_t stepX)
 {
     const int32_t count = ChromaWrittenArea(dst).columns;

@@ -8,8 +8,9 @@
 // to these functions; each instruction set implements them in a file of its own
 // (ResizeRows<Isa>.cpp). Plain declarations only: those files share no code with the others.
 //
-// Every function writes exactly `count` output bytes and reads source bytes only inside the
-// plan's windows, which lie inside the bytes the reference kernel reads.
+// Every function writes exactly `count` output bytes. It reads only source bytes between the
+// lowest and the highest its plan's plain tables name, which the reference kernel reads too;
+// the windows and pairs lie there.
 namespace avpost::detail {
 
 // Output bytes a plan serves per block; each block reads one 16-byte window of the source row.
@@ -18,7 +19,8 @@ constexpr int kPlanWindow = 16;
 
 // A nearest-neighbour row: out[o] = row[index[o]]. Block k takes output bytes 8k ... 8k + 7
 // from the window at row + windows[k]: out[8k + j] = window[picks[16k + j]] (picks 8 ... 15 of
-// a block are 0x80, giving 0).
+// a block are 0x80, giving 0). Windows and picks have a spare block after the last, so that
+// blocks can be taken two at a time.
 struct GatherPlan {
     int32_t count;
     const int32_t* index;
@@ -30,9 +32,10 @@ struct GatherPlan {
 // which equals (row[a] x (4096 - w) + row[b] x w) >> 12 with an arithmetic shift. Block k reads
 // the window at row + windows[k]: picksA[16k + 2j] is the offset of a for output 8k + j and
 // picksB likewise for b (odd bytes 0x80, so each pick yields a 16-bit word); eightfold[8k + j]
-// is 8 x w, so that the high half of 2 (b - a) x 8w is (b - a) x w >> 12.
+// is 8 x w, so that the high half of 2 (b - a) x 8w is (b - a) x w >> 12. A spare block follows
+// the last, as in a GatherPlan.
 //
-// Where every output blends two neighbouring bytes the plan also has pairs: output o is
+// Where every output blends two neighbouring bytes the plan may have pairs instead: output o is
 // (row[p] x pairWeights[2o] + row[p + 1] x pairWeights[2o + 1]) >> 12 with p = pairs[o], the
 // same value (a blend of a byte with itself is that byte, weight 0 or 4096 on it). The pairs run
 // on to a multiple of 16 outputs, repeating the last pair with weights 0.
