@@ -181,7 +181,8 @@ void VideoProcess::DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs, bo
     }
 }
 
-// MakeResizeImage, or MakeCropImageEx while a crop is set, after a black background when onBlack.
+// What MakeResizeImage draws (on black), or MakeCropImageEx while a crop is set (over the previous
+// picture); with onBlack both draw on black, and the frame turns black even without a picture.
 void VideoProcess::DrawScaled(bool onBlack) const
 {
     MEDIA_FRAME* picture = PictureForResize();
