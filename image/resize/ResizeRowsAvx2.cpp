@@ -60,8 +60,9 @@ __m256i BlendThirtyTwo(__m256i upper, __m256i lower, __m256i eightfold)
     return _mm256_packus_epi16(low, high);
 }
 
-void GatherAvx2(const uint8_t* row, const GatherPlan& plan, uint8_t* out)
+void GatherAvx2(const uint8_t* row, const GatherPlan& given, uint8_t* out)
 {
+    const GatherPlan plan = given;  // a copy that no store through out can change
     int32_t o = 0, k = 0;
     for (; o + 4 * kPlanBlock <= plan.count; o += 4 * kPlanBlock, k += 4) {
         const __m256i bytes = _mm256_unpacklo_epi64(GatherPair(row, plan, k), GatherPair(row, plan, k + 2));
@@ -74,8 +75,9 @@ void GatherAvx2(const uint8_t* row, const GatherPlan& plan, uint8_t* out)
     }
 }
 
-void BlendColumnsAvx2(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
+void BlendColumnsAvx2(const uint8_t* row, const BlendPlan& given, uint8_t* out)
 {
+    const BlendPlan plan = given;  // a copy that no store through out can change
     int32_t o = 0, k = 0;
     for (; o + 4 * kPlanBlock <= plan.count; o += 4 * kPlanBlock, k += 4) {
         const __m256i bytes = _mm256_packus_epi16(BlendPair(row, plan, k), BlendPair(row, plan, k + 2));

@@ -51,8 +51,9 @@ __m128i BlendEightPairs(const uint8_t* row, const BlendPlan& plan, int32_t o)
 
 }  // namespace
 
-void BlendPairsSse2(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
+void BlendPairsSse2(const uint8_t* row, const BlendPlan& given, uint8_t* out)
 {
+    const BlendPlan plan = given;  // a copy that no store through out can change
     for (int32_t o = 0; o < plan.count; o += 16) {
         const __m128i bytes = _mm_packus_epi16(BlendEightPairs(row, plan, o), BlendEightPairs(row, plan, o + 8));
         if (o + 16 <= plan.count)

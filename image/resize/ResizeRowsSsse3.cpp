@@ -44,14 +44,16 @@ void StoreSixteen(__m128i bytes, uint8_t* out, int32_t o, int32_t count)
         StoreFirst(bytes, out + o, count - o);
 }
 
-void GatherSsse3(const uint8_t* row, const GatherPlan& plan, uint8_t* out)
+void GatherSsse3(const uint8_t* row, const GatherPlan& given, uint8_t* out)
 {
+    const GatherPlan plan = given;  // a copy that no store through out can change
     for (int32_t o = 0, k = 0; o < plan.count; o += 2 * kPlanBlock, k += 2)
         StoreSixteen(_mm_unpacklo_epi64(GatherBlock(row, plan, k), GatherBlock(row, plan, k + 1)), out, o, plan.count);
 }
 
-void BlendColumnsSsse3(const uint8_t* row, const BlendPlan& plan, uint8_t* out)
+void BlendColumnsSsse3(const uint8_t* row, const BlendPlan& given, uint8_t* out)
 {
+    const BlendPlan plan = given;  // a copy that no store through out can change
     for (int32_t o = 0, k = 0; o < plan.count; o += 2 * kPlanBlock, k += 2)
         StoreSixteen(_mm_packus_epi16(BlendBlock(row, plan, k), BlendBlock(row, plan, k + 1)), out, o, plan.count);
 }
