@@ -96,9 +96,11 @@ Bitmap32 ReadBmp(ByteSource& file)
     const auto rawHeight = static_cast<int32_t>(Le32(header + 22));
     const unsigned bits = header[28] | header[29] << 8;
     const uint32_t compression = Le32(header + 30);
-    const int height = rawHeight < 0 ? -rawHeight : rawHeight;
-    if (width <= 0 || height <= 0 || width > kLargestPictureSide || height > kLargestPictureSide)
+    // Negative heights mark top-down rows; the most negative one has no positive counterpart.
+    const int64_t rows = rawHeight < 0 ? -int64_t{rawHeight} : rawHeight;
+    if (width <= 0 || rows <= 0 || width > kLargestPictureSide || rows > kLargestPictureSide)
         Fail(path, "BMP has an unusable size");
+    const int height = static_cast<int>(rows);
     if (bits != 24 && bits != 32)
         Fail(path, "unsupported BMP: " + std::to_string(bits) + " bits per pixel (24 and 32 are read)");
     if (compression != kUncompressed && !(compression == kBitFields && bits == 32))

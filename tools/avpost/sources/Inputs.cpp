@@ -103,7 +103,10 @@ std::string InputName(const std::string& path)
 
 Bitmap32 LoadWatermarkImage(const std::string& path)
 {
-    if (Head(path, 2) == "BM") {
+    const std::string head = Head(path, 2);
+    if (head.empty())
+        Fail(path, "empty file");
+    if (head == "BM") {
         InputFile file(path);
         return ReadBmp(file);
     }
