@@ -4,6 +4,7 @@ extern "C" {
 #include <libavutil/avutil.h>
 }
 
+#include <cerrno>
 #include <new>
 
 #include "tools/avpost/common/Interruption.h"
@@ -20,6 +21,16 @@ std::string ErrorText(int code)
     char text[AV_ERROR_MAX_STRING_SIZE] = {};
     av_strerror(code, text, sizeof(text));
     return text;
+}
+
+// Errors that say something about the file itself rather than its contents; the rest (invalid
+// data, or the demuxer the file's name suggests refusing it) mean FFmpeg found no media in it.
+bool IsFileError(int code)
+{
+    for (int error : {ENOENT, EACCES, EISDIR, EIO, ENOMEM, EMFILE})
+        if (code == AVERROR(error))
+            return true;
+    return false;
 }
 
 const char* TypeName(AVMediaType type)
@@ -42,7 +53,7 @@ FfmpegStream::FfmpegStream(const std::string& path, AVMediaType type) : name_(pa
     format->interrupt_callback.callback = [](void*) { return PendingInterruption() != 0 ? 1 : 0; };
     int code = avformat_open_input(&format, path.c_str(), nullptr, nullptr);
     if (code < 0)
-        Fail(path, code == AVERROR_INVALIDDATA ? "not a media file that avpost can read" : ErrorText(code));
+        Fail(path, IsFileError(code) ? ErrorText(code) : "not a media file that avpost can read");
     format_.reset(format);
     if ((code = avformat_find_stream_info(format, nullptr)) < 0)
         FailWith("cannot read the stream layout", code);
