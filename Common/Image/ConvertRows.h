@@ -54,6 +54,8 @@ int YuvBlocksToOpaqueSsse3(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToRgb24Avx2(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToRgb32Avx2(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToOpaqueAvx2(const YuvBlockRows& rows, int evenWidth);
+// The same blocks into 24-bit pixels by the per-pixel path.
+int YuvSimpleBlocksAvx2(const YuvBlockRows& rows, int evenWidth);
 
 // The packed 4:2:2 kernels work on whole groups from a group boundary and cover an even number of
 // columns; lumaOffset is the Y byte's place in a pixel's two bytes: 0 for YUY2, 1 for UYVY.

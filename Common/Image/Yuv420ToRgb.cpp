@@ -132,6 +132,23 @@ void PutSimple(int y, int u, int v, unsigned char* bgr)
     bgr[2] = static_cast<unsigned char>(r);
 }
 
+// The reference of the per-pixel path's block kernels: each pixel of a block with the block's
+// chroma.
+int SimpleBlocks(const YuvBlockRows& rows, int evenWidth)
+{
+    const unsigned char* y0 = rows.y0;
+    const unsigned char* y1 = rows.y1;
+    const unsigned char* u = rows.u;
+    const unsigned char* v = rows.v;
+    unsigned char* d0 = rows.dst0;
+    unsigned char* d1 = rows.dst1;
+    for (int c = 0; c < evenWidth; ++c) {
+        PutSimple(y0[c], u[c >> 1], v[c >> 1], d0 + 3 * c);
+        PutSimple(y1[c], u[c >> 1], v[c >> 1], d1 + 3 * c);
+    }
+    return evenWidth;
+}
+
 }  // namespace
 
 void Yuv420ToRgb(const PackedRows& dst, const PlanarPicture& src, int width, int height, int bytesPerPixel,
@@ -147,15 +164,17 @@ void Yuv420ToRgb(const PackedRows& dst, const PlanarPicture& src, int width, int
 
 void Yuv420ToRgb24Simple(const PackedRows& dst, const PlanarPicture& src, int width, int height)
 {
+    static constexpr simd::Variants<YuvBlocksKernel> kKernels{
+        {SimpleBlocks, nullptr, nullptr, nullptr, YuvSimpleBlocksAvx2}};
+    const YuvBlocksKernel kernel = kKernels.Pick();
     const int evenWidth = width & ~1;
     const int evenHeight = height & ~1;
-    for (int r = 0; r < evenHeight; ++r) {
-        const unsigned char* y = src.YRow(r);
-        const unsigned char* u = src.URow(r >> 1);
-        const unsigned char* v = src.VRow(r >> 1);
-        unsigned char* out = dst.Row(r);
-        for (int c = 0; c < evenWidth; ++c)
-            PutSimple(y[c], u[c >> 1], v[c >> 1], out + 3 * c);
+    for (int r = 0; r < evenHeight; r += 2) {
+        const YuvBlockRows rows{src.YRow(r),      src.YRow(r + 1), src.URow(r >> 1),
+                                src.VRow(r >> 1), dst.Row(r),      dst.Row(r + 1)};
+        const int done = kernel(rows, evenWidth);
+        if (done < evenWidth)
+            SimpleBlocks(Advanced<3>(rows, done), evenWidth - done);
     }
 }
 

@@ -1,8 +1,9 @@
-// The YUV-to-RGB block kernels with AVX2: 32 columns of a row pair per step, in 16-bit lanes.
-// With T the chroma term of a colour (the reference's sum without the luma product) and 9536 =
-// 64 * 149, (9536 * Y + T) >> 13 = (T >> 13) + ((149 * Y + ((T >> 6) & 127)) >> 7) exactly, and
-// every part of the right-hand side fits in 16 bits. Packing the 16-bit results to bytes with
-// unsigned saturation is the reference's clamp to 0...255.
+// The YUV-to-RGB kernels with AVX2: 32 columns per step, in 16-bit lanes. With T the chroma term
+// of a colour (the reference's sum without the luma product), the table path's 9536 = 64 * 149
+// gives (9536 * Y + T) >> 13 = (T >> 13) + ((149 * Y + ((T >> 6) & 127)) >> 7) exactly, and the
+// per-pixel path's 1192 = 8 * 149 likewise (1192 * Y + T) >> 10 = (T >> 10) + ((149 * Y +
+// ((T >> 3) & 127)) >> 7); every part of the right-hand sides fits in 16 bits. Packing the 16-bit
+// results to bytes with unsigned saturation is the reference's clamp to 0...255.
 #include <immintrin.h>
 
 #include "Common/Image/ConvertRows.h"
@@ -29,16 +30,16 @@ struct ChromaTerms16 {
 // The terms of 16 chroma samples given as (U, V) word pairs of samples 0-7 and 8-15: in sample
 // order, or in the order packing leaves them (0-3, 8-11 | 4-7, 12-15).
 [[gnu::always_inline]] inline ColourTerms Terms(__m256i pairs0, __m256i pairs1, __m256i coefficients, int constant,
-                                                bool ordered)
+                                                int shift, bool ordered)
 {
     const __m256i bias = _mm256_set1_epi32(constant);
     const __m256i t0 = _mm256_add_epi32(_mm256_madd_epi16(pairs0, coefficients), bias);
     const __m256i t1 = _mm256_add_epi32(_mm256_madd_epi16(pairs1, coefficients), bias);
     const __m256i low7 = _mm256_set1_epi32(127);
     ColourTerms terms;
-    terms.whole = _mm256_packs_epi32(_mm256_srai_epi32(t0, 13), _mm256_srai_epi32(t1, 13));
-    terms.fraction = _mm256_packs_epi32(_mm256_and_si256(_mm256_srai_epi32(t0, 6), low7),
-                                        _mm256_and_si256(_mm256_srai_epi32(t1, 6), low7));
+    terms.whole = _mm256_packs_epi32(_mm256_srai_epi32(t0, shift), _mm256_srai_epi32(t1, shift));
+    terms.fraction = _mm256_packs_epi32(_mm256_and_si256(_mm256_srai_epi32(t0, shift - 7), low7),
+                                        _mm256_and_si256(_mm256_srai_epi32(t1, shift - 7), low7));
     if (ordered) {
         terms.whole = _mm256_permute4x64_epi64(terms.whole, 0xD8);
         terms.fraction = _mm256_permute4x64_epi64(terms.fraction, 0xD8);
@@ -46,22 +47,28 @@ struct ChromaTerms16 {
     return terms;
 }
 
-[[gnu::always_inline]] inline ChromaTerms16 AllTerms(__m256i pairs0, __m256i pairs1, bool ordered)
+[[gnu::always_inline]] inline ChromaTerms16 AllTerms(__m256i pairs0, __m256i pairs1, bool perPixel, bool ordered)
 {
     ChromaTerms16 t;
-    t.blue = Terms(pairs0, pairs1, WordPair(16532, 0), -2268594, ordered);
-    t.green = Terms(pairs0, pairs1, WordPair(-3203, -6660), 1109918, ordered);
-    t.red = Terms(pairs0, pairs1, WordPair(0, 13074), -1826095, ordered);
+    if (perPixel) {
+        t.blue = Terms(pairs0, pairs1, WordPair(2065, 0), -282880, 10, ordered);
+        t.green = Terms(pairs0, pairs1, WordPair(-401, -833), 139392, 10, ordered);
+        t.red = Terms(pairs0, pairs1, WordPair(0, 1634), -227712, 10, ordered);
+    } else {
+        t.blue = Terms(pairs0, pairs1, WordPair(16532, 0), -2268594, 13, ordered);
+        t.green = Terms(pairs0, pairs1, WordPair(-3203, -6660), 1109918, 13, ordered);
+        t.red = Terms(pairs0, pairs1, WordPair(0, 13074), -1826095, 13, ordered);
+    }
     return t;
 }
 
 // The terms of 16 samples of planar chroma rows, in sample order.
-[[gnu::always_inline]] inline ChromaTerms16 LoadTerms(const unsigned char* u, const unsigned char* v)
+[[gnu::always_inline]] inline ChromaTerms16 LoadTerms(const unsigned char* u, const unsigned char* v, bool perPixel)
 {
     const __m128i us = _mm_loadu_si128(reinterpret_cast<const __m128i*>(u));
     const __m128i vs = _mm_loadu_si128(reinterpret_cast<const __m128i*>(v));
     return AllTerms(_mm256_cvtepu8_epi16(_mm_unpacklo_epi8(us, vs)), _mm256_cvtepu8_epi16(_mm_unpackhi_epi8(us, vs)),
-                    true);
+                    perPixel, true);
 }
 
 // Each chroma sample twice, for the pixels of the luma words that unpacking low (pixels 0-7 and
@@ -177,21 +184,21 @@ struct Rgb24Shuffles {
     }
 }
 
-enum Output { kRgb24, kRgb32Keep, kRgb32Opaque };
+enum Output { kRgb24, kRgb32Keep, kRgb32Opaque, kRgb24PerPixel };
 
 [[gnu::always_inline]] inline int Blocks(const YuvBlockRows& rows, int evenWidth, Output output)
 {
     const Rgb24Shuffles shuffles = MakeRgb24Shuffles();
     const __m256i opaque = _mm256_set1_epi8(-1);
-    const int bytes = output == kRgb24 ? 3 : 4;
+    const int bytes = output == kRgb24 || output == kRgb24PerPixel ? 3 : 4;
     int c = 0;
     for (; c + 32 <= evenWidth; c += 32) {
-        const ChromaTerms16 terms = LoadTerms(rows.u + c / 2, rows.v + c / 2);
+        const ChromaTerms16 terms = LoadTerms(rows.u + c / 2, rows.v + c / 2, output == kRgb24PerPixel);
         const SpreadTerms low = SpreadAll(terms, false);
         const SpreadTerms high = SpreadAll(terms, true);
         const Colours row0 = ConvertRow(rows.y0 + c, low, high);
         const Colours row1 = ConvertRow(rows.y1 + c, low, high);
-        if (output == kRgb24) {
+        if (output == kRgb24 || output == kRgb24PerPixel) {
             StoreRgb24(row0, shuffles, rows.dst0 + c * bytes);
             StoreRgb24(row1, shuffles, rows.dst1 + c * bytes);
         } else {
@@ -226,6 +233,11 @@ int YuvBlocksToOpaqueAvx2(const YuvBlockRows& rows, int evenWidth)
     return Blocks(rows, evenWidth, kRgb32Opaque);
 }
 
+int YuvSimpleBlocksAvx2(const YuvBlockRows& rows, int evenWidth)
+{
+    return Blocks(rows, evenWidth, kRgb24PerPixel);
+}
+
 int PackedToRgb24Avx2(const unsigned char* packed, unsigned char* bgr, int columns, int lumaOffset)
 {
     const Rgb24Shuffles shuffles = MakeRgb24Shuffles();
@@ -236,7 +248,7 @@ int PackedToRgb24Avx2(const unsigned char* packed, unsigned char* bgr, int colum
         // The chroma bytes are (U, V) word pairs already; their terms stay in packing order, which
         // spreads them over pixels 0-7 | 8-15 and 16-23 | 24-31, the luma words' order.
         const ChromaTerms16 terms =
-            AllTerms(ByteOfPixels(groups0, 1 - lumaOffset), ByteOfPixels(groups1, 1 - lumaOffset), false);
+            AllTerms(ByteOfPixels(groups0, 1 - lumaOffset), ByteOfPixels(groups1, 1 - lumaOffset), false, false);
         Colours colours = ConvertWords(ByteOfPixels(groups0, lumaOffset), ByteOfPixels(groups1, lumaOffset),
                                        SpreadAll(terms, false), SpreadAll(terms, true));
         colours.blue = _mm256_permute4x64_epi64(colours.blue, 0xD8);
