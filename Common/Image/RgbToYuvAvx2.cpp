@@ -71,25 +71,37 @@ struct Arithmetic {
     Output y, u, v;
 };
 
+// Members are assigned one by one: a braced list of calls would make the compiler prepare to
+// unwind a part-built record, which brings in the shared exception-handling personality.
 [[gnu::always_inline]] inline Output Scaled(int blue, int green1, int red, int green2, int bias)
 {
-    return Output{WordPair(blue, green1), WordPair(red, green2), _mm256_set1_epi32(bias)};
+    Output k;
+    k.blueGreen = WordPair(blue, green1);
+    k.redGreen = WordPair(red, green2);
+    k.bias = _mm256_set1_epi32(bias);
+    return k;
 }
 
 // Table path: 4 x (1606, 8258, 4211), (7193, -4768, -2425), (-1163, -6029, 7193); Y's bias of 16 is
 // added to the packed bytes.
 [[gnu::always_inline]] inline Arithmetic TablePath()
 {
-    return Arithmetic{Scaled(6424, 16516, 16844, 16516, 0), Scaled(28772, -19072, -9700, 0, 0),
-                      Scaled(-4652, -24116, 28772, 0, 0)};
+    Arithmetic k;
+    k.y = Scaled(6424, 16516, 16844, 16516, 0);
+    k.u = Scaled(28772, -19072, -9700, 0, 0);
+    k.v = Scaled(-4652, -24116, 28772, 0, 0);
+    return k;
 }
 
 // Per-pixel path: 64 x (100, 516, 263) + 64 x 16896, (450, -298, -152) and (-73, -377, 450), each
 // + 64 x 131584.
 [[gnu::always_inline]] inline Arithmetic PerPixelPath()
 {
-    return Arithmetic{Scaled(6400, 16512, 16832, 16512, 1081344), Scaled(28800, -19072, -9728, 0, 8421376),
-                      Scaled(-4672, -24128, 28800, 0, 8421376)};
+    Arithmetic k;
+    k.y = Scaled(6400, 16512, 16832, 16512, 1081344);
+    k.u = Scaled(28800, -19072, -9728, 0, 8421376);
+    k.v = Scaled(-4672, -24128, 28800, 0, 8421376);
+    return k;
 }
 
 // The high words of 16 pixels' sums in pixel order, from `a` holding pixels 0-3 | 8-11 and `b`
@@ -172,7 +184,7 @@ struct BlockOutput {
 
 // Table path: luma with its bias, chroma as (sum of four dU + 512) >> 2 and likewise dV. 32
 // columns per step, in two halves of 16.
-[[gnu::always_inline]] inline int TableBlocks(const RgbBlockRows& rows, int evenWidth, int bytes, bool alpha)
+int TableBlocks(const RgbBlockRows& rows, int evenWidth, int bytes, bool alpha)
 {
     // High lanes start four bytes early with 24-bit pixels, so that no load reaches past pixel 15.
     const int highSkip = bytes == 3 ? 4 : 0;

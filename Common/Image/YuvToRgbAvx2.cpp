@@ -172,8 +172,12 @@ struct Rgb24Shuffles {
     const __m256i p1 = _mm256_unpackhi_epi16(blueGreenLow, redAlphaLow);
     const __m256i p2 = _mm256_unpacklo_epi16(blueGreenHigh, redAlphaHigh);
     const __m256i p3 = _mm256_unpackhi_epi16(blueGreenHigh, redAlphaHigh);
-    const __m256i ordered[4] = {_mm256_permute2x128_si256(p0, p1, 0x20), _mm256_permute2x128_si256(p2, p3, 0x20),
-                                _mm256_permute2x128_si256(p0, p1, 0x31), _mm256_permute2x128_si256(p2, p3, 0x31)};
+    // Assigned one by one, as a braced list of calls brings in exception-handling support.
+    __m256i ordered[4];
+    ordered[0] = _mm256_permute2x128_si256(p0, p1, 0x20);
+    ordered[1] = _mm256_permute2x128_si256(p2, p3, 0x20);
+    ordered[2] = _mm256_permute2x128_si256(p0, p1, 0x31);
+    ordered[3] = _mm256_permute2x128_si256(p2, p3, 0x31);
     const __m256i fourthBytes = _mm256_set1_epi32(static_cast<int>(0xFF000000u));
     for (int i = 0; i < 4; ++i) {
         __m256i* out = reinterpret_cast<__m256i*>(dst + 32 * i);
@@ -186,7 +190,7 @@ struct Rgb24Shuffles {
 
 enum Output { kRgb24, kRgb32Keep, kRgb32Opaque, kRgb24PerPixel };
 
-[[gnu::always_inline]] inline int Blocks(const YuvBlockRows& rows, int evenWidth, Output output)
+int Blocks(const YuvBlockRows& rows, int evenWidth, Output output)
 {
     const Rgb24Shuffles shuffles = MakeRgb24Shuffles();
     const __m256i opaque = _mm256_set1_epi8(-1);
