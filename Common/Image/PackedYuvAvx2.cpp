@@ -37,30 +37,45 @@ namespace {
     return _mm256_permute4x64_epi64(packed, 0xD8);
 }
 
+// 32 columns of a row pair: their Y bytes and the truncated average of the two rows' chroma.
+template <int kLumaOffset>
+[[gnu::always_inline]] inline void Columns32(const PackedPairRows& rows, int c)
+{
+    const __m256i top0 = Load(rows.top + 2 * c);
+    const __m256i top1 = Load(rows.top + 2 * c + 32);
+    const __m256i bottom0 = Load(rows.bottom + 2 * c);
+    const __m256i bottom1 = Load(rows.bottom + 2 * c + 32);
+    Store(rows.y0 + c, PixelBytes(top0, top1, kLumaOffset));
+    Store(rows.y1 + c, PixelBytes(bottom0, bottom1, kLumaOffset));
+    // U and V of groups 0-3 and 8-11 in the low lane, 4-7 and 12-15 in the high lane.
+    const __m256i chroma = _mm256_packus_epi16(ByteOfPixels(TruncatedAverage(top0, bottom0), 1 - kLumaOffset),
+                                               ByteOfPixels(TruncatedAverage(top1, bottom1), 1 - kLumaOffset));
+    const __m256i split = _mm256_packus_epi16(ByteOfPixels(chroma, 0), ByteOfPixels(chroma, 1));
+    const __m256i uv = _mm256_permutevar8x32_epi32(split, _mm256_setr_epi32(0, 4, 1, 5, 2, 6, 3, 7));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(rows.u + c / 2), _mm256_castsi256_si128(uv));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(rows.v + c / 2), _mm256_extracti128_si256(uv, 1));
+}
+
+template <int kLumaOffset>
+int PackedPairToPlanar(PackedPairRows rows, int columns)
+{
+    int c = 0;
+    for (; c + 64 <= columns; c += 64) {
+        Columns32<kLumaOffset>(rows, c);
+        Columns32<kLumaOffset>(rows, c + 32);
+    }
+    if (c + 32 <= columns) {
+        Columns32<kLumaOffset>(rows, c);
+        c += 32;
+    }
+    return c;
+}
+
 }  // namespace
 
 int PackedToPlanarAvx2(const PackedPairRows& rows, int columns, int lumaOffset)
 {
-    const int chromaHigh = 1 - lumaOffset;
-    const __m256i chromaOrder = _mm256_setr_epi32(0, 4, 1, 5, 2, 6, 3, 7);
-    int c = 0;
-    for (; c + 32 <= columns; c += 32) {
-        const __m256i top0 = Load(rows.top + 2 * c);
-        const __m256i top1 = Load(rows.top + 2 * c + 32);
-        const __m256i bottom0 = Load(rows.bottom + 2 * c);
-        const __m256i bottom1 = Load(rows.bottom + 2 * c + 32);
-        Store(rows.y0 + c, PixelBytes(top0, top1, lumaOffset));
-        Store(rows.y1 + c, PixelBytes(bottom0, bottom1, lumaOffset));
-
-        // U and V of groups 0-3 and 8-11 in the low lane, 4-7 and 12-15 in the high lane.
-        const __m256i chroma = _mm256_packus_epi16(ByteOfPixels(TruncatedAverage(top0, bottom0), chromaHigh),
-                                                   ByteOfPixels(TruncatedAverage(top1, bottom1), chromaHigh));
-        const __m256i split = _mm256_packus_epi16(ByteOfPixels(chroma, 0), ByteOfPixels(chroma, 1));
-        const __m256i uv = _mm256_permutevar8x32_epi32(split, chromaOrder);
-        _mm_storeu_si128(reinterpret_cast<__m128i*>(rows.u + c / 2), _mm256_castsi256_si128(uv));
-        _mm_storeu_si128(reinterpret_cast<__m128i*>(rows.v + c / 2), _mm256_extracti128_si256(uv, 1));
-    }
-    return c;
+    return lumaOffset ? PackedPairToPlanar<1>(rows, columns) : PackedPairToPlanar<0>(rows, columns);
 }
 
 int PlanarToPackedAvx2(const unsigned char* y, const unsigned char* u, const unsigned char* v, unsigned char* packed,

@@ -184,8 +184,10 @@ struct BlockOutput {
 
 // Table path: luma with its bias, chroma as (sum of four dU + 512) >> 2 and likewise dV. 32
 // columns per step, in two halves of 16.
-int TableBlocks(const RgbBlockRows& rows, int evenWidth, int bytes, bool alpha)
+template <int kBytes, bool kAlpha>
+int TableBlocks(const RgbBlockRows& rows, int evenWidth)
 {
+    const int bytes = kBytes;
     // High lanes start four bytes early with 24-bit pixels, so that no load reaches past pixel 15.
     const int highSkip = bytes == 3 ? 4 : 0;
     const PixelShuffles s = Shuffles(bytes, highSkip);
@@ -207,7 +209,7 @@ int TableBlocks(const RgbBlockRows& rows, int evenWidth, int bytes, bool alpha)
             y1[half] = r1.y;
             u[half] = _mm256_srai_epi32(_mm256_add_epi32(BlockSums(r0.u, r1.u), rounding), 2);
             v[half] = _mm256_srai_epi32(_mm256_add_epi32(BlockSums(r0.v, r1.v), rounding), 2);
-            if (alpha) {
+            if constexpr (kAlpha) {
                 StoreFourthBytes(src0 + column * bytes, s.fourth, a0 + column);
                 StoreFourthBytes(src1 + column * bytes, s.fourth, a1 + column);
             }
@@ -226,17 +228,17 @@ int TableBlocks(const RgbBlockRows& rows, int evenWidth, int bytes, bool alpha)
 
 int Rgb24BlocksAvx2(const RgbBlockRows& rows, int evenWidth)
 {
-    return TableBlocks(rows, evenWidth, 3, false);
+    return TableBlocks<3, false>(rows, evenWidth);
 }
 
 int Rgb32BlocksAvx2(const RgbBlockRows& rows, int evenWidth)
 {
-    return TableBlocks(rows, evenWidth, 4, false);
+    return TableBlocks<4, false>(rows, evenWidth);
 }
 
 int Rgb32AlphaBlocksAvx2(const RgbBlockRows& rows, int evenWidth)
 {
-    return TableBlocks(rows, evenWidth, 4, true);
+    return TableBlocks<4, true>(rows, evenWidth);
 }
 
 // Per-pixel path: every value clamped, chroma the sum of four clamped values >> 2.

@@ -15,12 +15,27 @@ struct StretchConstants {
     __m256i limit;
 };
 
-template <bool kSubtract>
+// The forms a stretch's arithmetic takes: a + f, a - f (every stretch between -100 and 0 percent)
+// and a * whole + f, with f = (a * fraction) >> 16.
+enum StretchKind { kAddOnce, kSubtractOnce, kScaled };
+
+StretchKind KindOf(const StretchStep& step)
+{
+    if (step.subtract)
+        return kSubtractOnce;
+    return step.whole == 1 ? kAddOnce : kScaled;
+}
+
+template <int kKind>
 [[gnu::always_inline]] inline __m256i Stretch(__m256i distance, const StretchConstants& k)
 {
-    const __m256i whole = _mm256_mullo_epi16(distance, k.whole);
     const __m256i part = _mm256_mulhi_epu16(distance, k.fraction);
-    return kSubtract ? _mm256_sub_epi16(whole, part) : _mm256_add_epi16(whole, part);
+    if constexpr (kKind == kAddOnce)
+        return _mm256_add_epi16(distance, part);
+    else if constexpr (kKind == kSubtractOnce)
+        return _mm256_sub_epi16(distance, part);
+    else
+        return _mm256_add_epi16(_mm256_mullo_epi16(distance, k.whole), part);
 }
 
 // The map's steps as vector constants.
@@ -28,7 +43,8 @@ struct MapConstants {
     bool brightenUp;
     __m256i brightness;
     StretchConstants stretch[2];
-    bool flip;
+    bool flip;       // the stretches move values to the other side of 128
+    bool clampHigh;  // the upper clamp lies within 128 + the last stretch's limit
     __m256i lastLimit;
     __m256i high;
 };
@@ -38,24 +54,27 @@ struct MapConstants {
     MapConstants k;
     k.brightenUp = map.brightness > 0;
     k.brightness = _mm256_set1_epi8(static_cast<char>(map.brightness < 0 ? -map.brightness : map.brightness));
-    k.flip = false;
+    bool flip = false;
     for (int i = 0; i < map.stretchCount; ++i) {
         const StretchStep& step = map.stretch[i];
         k.stretch[i].whole = _mm256_set1_epi16(static_cast<short>(step.whole));
         k.stretch[i].fraction = _mm256_set1_epi16(static_cast<short>(step.fraction));
         k.stretch[i].limit = _mm256_set1_epi16(static_cast<short>(step.limit));
-        k.flip = k.flip != (step.flip != 0);
+        flip = flip != (step.flip != 0);
     }
-    k.lastLimit =
-        _mm256_set1_epi8(static_cast<char>(map.stretchCount > 0 ? map.stretch[map.stretchCount - 1].limit : 0));
+    k.flip = flip;
+    const int lastLimit = map.stretchCount > 0 ? map.stretch[map.stretchCount - 1].limit : 0;
+    k.clampHigh = map.high < 128 + lastLimit;
+    k.lastLimit = _mm256_set1_epi8(static_cast<char>(lastLimit));
     k.high = _mm256_set1_epi8(static_cast<char>(map.high));
     return k;
 }
 
 // 32 values through a map of a given shape; each shape has a loop of its own, free of tests of
-// the shape. After the stretches the limit keeps every value within 128 +- 112, which is the
-// lower clamp; only the upper one (235 for luma) is left to do.
-template <bool kBrighten, int kStretches, bool kSubtract0, bool kSubtract1>
+// the shape (the tests of constants left in it the compiler takes out of the loop). After the
+// stretches the limit keeps every value within 128 +- 112, which is the lower clamp; only the
+// upper one (235 for luma) is left to do. 128 + m and 128 - m are worked modulo 256.
+template <bool kBrighten, int kStretches, int kKind0, int kKind1>
 [[gnu::always_inline]] inline __m256i MapValues(__m256i values, const MapConstants& k)
 {
     if constexpr (kBrighten) {
@@ -69,48 +88,70 @@ template <bool kBrighten, int kStretches, bool kSubtract0, bool kSubtract1>
         // value - 128 as a signed byte, and its size 0...128 as an unsigned one.
         const __m256i signedDistance = _mm256_xor_si256(values, middle);
         const __m256i distance = _mm256_abs_epi8(signedDistance);
-        __m256i lowHalf = Stretch<kSubtract0>(_mm256_unpacklo_epi8(distance, zero), k.stretch[0]);
-        __m256i highHalf = Stretch<kSubtract0>(_mm256_unpackhi_epi8(distance, zero), k.stretch[0]);
+        __m256i lowHalf = Stretch<kKind0>(_mm256_unpacklo_epi8(distance, zero), k.stretch[0]);
+        __m256i highHalf = Stretch<kKind0>(_mm256_unpackhi_epi8(distance, zero), k.stretch[0]);
         if constexpr (kStretches > 1) {
-            lowHalf = Stretch<kSubtract1>(_mm256_min_epi16(lowHalf, k.stretch[0].limit), k.stretch[1]);
-            highHalf = Stretch<kSubtract1>(_mm256_min_epi16(highHalf, k.stretch[0].limit), k.stretch[1]);
+            lowHalf = Stretch<kKind1>(_mm256_min_epi16(lowHalf, k.stretch[0].limit), k.stretch[1]);
+            highHalf = Stretch<kKind1>(_mm256_min_epi16(highHalf, k.stretch[0].limit), k.stretch[1]);
         }
         const __m256i stretched = _mm256_min_epu8(_mm256_packus_epi16(lowHalf, highHalf), k.lastLimit);
-        __m256i moved = _mm256_sign_epi8(stretched, signedDistance);
-        if (k.flip)
-            moved = _mm256_sub_epi8(zero, moved);
-        values = _mm256_min_epu8(_mm256_xor_si256(moved, middle), k.high);
+        const __m256i moved = _mm256_sign_epi8(stretched, signedDistance);
+        values = k.flip ? _mm256_sub_epi8(middle, moved) : _mm256_add_epi8(middle, moved);
+        if (k.clampHigh)
+            values = _mm256_min_epu8(values, k.high);
     }
     return values;
 }
 
-template <bool kBrighten, int kStretches, bool kSubtract0 = false, bool kSubtract1 = false>
+// Two vectors a step, so that their work interleaves.
+template <bool kBrighten, int kStretches, int kKind0, int kKind1>
 int MapRow(unsigned char* row, int count, const MapConstants& k)
 {
     int c = 0;
+    for (; c + 64 <= count; c += 64) {
+        __m256i* at = reinterpret_cast<__m256i*>(row + c);
+        const __m256i first = MapValues<kBrighten, kStretches, kKind0, kKind1>(_mm256_loadu_si256(at), k);
+        const __m256i second = MapValues<kBrighten, kStretches, kKind0, kKind1>(_mm256_loadu_si256(at + 1), k);
+        _mm256_storeu_si256(at, first);
+        _mm256_storeu_si256(at + 1, second);
+    }
     for (; c + 32 <= count; c += 32) {
         __m256i* at = reinterpret_cast<__m256i*>(row + c);
-        _mm256_storeu_si256(at, MapValues<kBrighten, kStretches, kSubtract0, kSubtract1>(_mm256_loadu_si256(at), k));
+        _mm256_storeu_si256(at, MapValues<kBrighten, kStretches, kKind0, kKind1>(_mm256_loadu_si256(at), k));
     }
     return c;
 }
 
-template <bool kBrighten>
-int MapRowByStretches(unsigned char* row, int count, const ValueMap& map, const MapConstants& k)
+template <bool kBrighten, int kStretches, int kKind0>
+int MapRowOfKinds(unsigned char* row, int count, StretchKind kind1, const MapConstants& k)
 {
-    const bool subtract0 = map.stretchCount > 0 && map.stretch[0].subtract;
-    const bool subtract1 = map.stretchCount > 1 && map.stretch[1].subtract;
-    switch (map.stretchCount) {
-        case 0:
-            return kBrighten ? MapRow<kBrighten, 0>(row, count, k) : count;
-        case 1:
-            return subtract0 ? MapRow<kBrighten, 1, true>(row, count, k) : MapRow<kBrighten, 1, false>(row, count, k);
+    if constexpr (kStretches < 2)
+        return MapRow<kBrighten, kStretches, kKind0, kAddOnce>(row, count, k);
+    switch (kind1) {
+        case kAddOnce:
+            return MapRow<kBrighten, kStretches, kKind0, kAddOnce>(row, count, k);
+        case kSubtractOnce:
+            return MapRow<kBrighten, kStretches, kKind0, kSubtractOnce>(row, count, k);
         default:
-            if (subtract0)
-                return subtract1 ? MapRow<kBrighten, 2, true, true>(row, count, k)
-                                 : MapRow<kBrighten, 2, true, false>(row, count, k);
-            return subtract1 ? MapRow<kBrighten, 2, false, true>(row, count, k)
-                             : MapRow<kBrighten, 2, false, false>(row, count, k);
+            return MapRow<kBrighten, kStretches, kKind0, kScaled>(row, count, k);
+    }
+}
+
+template <bool kBrighten, int kStretches>
+int MapRowOfShape(unsigned char* row, int count, const ValueMap& map, const MapConstants& k)
+{
+    if constexpr (kStretches == 0) {
+        return MapRow<kBrighten, 0, kAddOnce, kAddOnce>(row, count, k);
+    } else {
+        const StretchKind kind1 = kStretches > 1 ? KindOf(map.stretch[1]) : kAddOnce;
+        switch (KindOf(map.stretch[0])) {
+            case kAddOnce:
+                return MapRowOfKinds<kBrighten, kStretches, kAddOnce>(row, count, kind1, k);
+            case kSubtractOnce:
+                return MapRowOfKinds<kBrighten, kStretches, kSubtractOnce>(row, count, kind1, k);
+            default:
+                return MapRowOfKinds<kBrighten, kStretches, kScaled>(row, count, kind1, k);
+        }
     }
 }
 
@@ -119,8 +160,16 @@ int MapRowByStretches(unsigned char* row, int count, const ValueMap& map, const 
 int MapValuesAvx2(unsigned char* row, int count, const ValueMap& map)
 {
     const MapConstants k = ConstantsOf(map);
-    return map.brightness != 0 ? MapRowByStretches<true>(row, count, map, k)
-                               : MapRowByStretches<false>(row, count, map, k);
+    if (map.brightness != 0) {
+        if (map.stretchCount == 0)
+            return MapRowOfShape<true, 0>(row, count, map, k);
+        return map.stretchCount == 1 ? MapRowOfShape<true, 1>(row, count, map, k)
+                                     : MapRowOfShape<true, 2>(row, count, map, k);
+    }
+    if (map.stretchCount == 0)
+        return count;
+    return map.stretchCount == 1 ? MapRowOfShape<false, 1>(row, count, map, k)
+                                 : MapRowOfShape<false, 2>(row, count, map, k);
 }
 
 }  // namespace avpost::detail
