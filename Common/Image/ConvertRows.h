@@ -26,9 +26,6 @@ struct RgbBlockRows {
 // Table-path RGB to YUV 4:2:0 of the whole 2 x 2 blocks of a row pair, `evenWidth` columns:
 // 24-bit pixels, 32-bit pixels, and 32-bit pixels whose fourth bytes go to the alpha rows.
 using RgbBlocksKernel = int (*)(const RgbBlockRows& rows, int evenWidth);
-int Rgb24BlocksSsse3(const RgbBlockRows& rows, int evenWidth);
-int Rgb32BlocksSsse3(const RgbBlockRows& rows, int evenWidth);
-int Rgb32AlphaBlocksSsse3(const RgbBlockRows& rows, int evenWidth);
 int Rgb24BlocksAvx2(const RgbBlockRows& rows, int evenWidth);
 int Rgb32BlocksAvx2(const RgbBlockRows& rows, int evenWidth);
 int Rgb32AlphaBlocksAvx2(const RgbBlockRows& rows, int evenWidth);
@@ -48,9 +45,6 @@ struct YuvBlockRows {
 // Table-path YUV 4:2:0 to RGB of the whole 2 x 2 blocks of a row pair, `evenWidth` columns:
 // 24-bit pixels, 32-bit pixels keeping their fourth bytes, and 32-bit pixels made opaque.
 using YuvBlocksKernel = int (*)(const YuvBlockRows& rows, int evenWidth);
-int YuvBlocksToRgb24Ssse3(const YuvBlockRows& rows, int evenWidth);
-int YuvBlocksToRgb32Ssse3(const YuvBlockRows& rows, int evenWidth);
-int YuvBlocksToOpaqueSsse3(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToRgb24Avx2(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToRgb32Avx2(const YuvBlockRows& rows, int evenWidth);
 int YuvBlocksToOpaqueAvx2(const YuvBlockRows& rows, int evenWidth);

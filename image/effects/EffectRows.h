@@ -3,8 +3,8 @@
 
 // The row kernels of the picture effects. Each has its reference beside the code that calls it
 // and faster variants in one file per instruction set; a variant does the same work on the
-// leading part of a row and returns how many bytes (or pixels) it did, and the caller does the
-// rest with the reference. Variants are picked at run time (support/CpuFeatures.h). Plain
+// leading part of a row (or the whole row) and returns how many bytes (or pixels) it did, and the
+// caller does the rest with the reference. Variants are picked at run time (support/CpuFeatures.h). Plain
 // declarations only: the instruction-set files must share no code with the rest of the library.
 
 namespace avpost::detail {

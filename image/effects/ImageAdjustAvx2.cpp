@@ -103,10 +103,16 @@ template <bool kBrighten, int kStretches, int kKind0, int kKind1>
     return values;
 }
 
-// Two vectors a step, so that their work interleaves.
+// Two vectors a step, so that their work interleaves. A row of at least 32 values is done whole:
+// the last 32 are mapped from their first values before any store can reach them and stored after
+// the loop, whose own last steps may have covered some of them with the same results.
 template <bool kBrighten, int kStretches, int kKind0, int kKind1>
 int MapRow(unsigned char* row, int count, const MapConstants& k)
 {
+    if (count < 32)
+        return 0;
+    __m256i* lastAt = reinterpret_cast<__m256i*>(row + count - 32);
+    const __m256i last = MapValues<kBrighten, kStretches, kKind0, kKind1>(_mm256_loadu_si256(lastAt), k);
     int c = 0;
     for (; c + 64 <= count; c += 64) {
         __m256i* at = reinterpret_cast<__m256i*>(row + c);
@@ -119,7 +125,8 @@ int MapRow(unsigned char* row, int count, const MapConstants& k)
         __m256i* at = reinterpret_cast<__m256i*>(row + c);
         _mm256_storeu_si256(at, MapValues<kBrighten, kStretches, kKind0, kKind1>(_mm256_loadu_si256(at), k));
     }
-    return c;
+    _mm256_storeu_si256(lastAt, last);
+    return count;
 }
 
 template <bool kBrighten, int kStretches, int kKind0>

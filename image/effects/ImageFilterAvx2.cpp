@@ -25,48 +25,68 @@ namespace {
     return _mm256_permute4x64_epi64(_mm256_shuffle_epi8(bytes, backwards), 0x4E);
 }
 
-}  // namespace
-
 // 128 + y - n without leaving the bytes: one of the two saturating differences is 0, the other
 // moves 128 up or down, and the clamps to 0 and 255 lie outside 16...235.
+[[gnu::always_inline]] inline __m256i Relief(__m256i y, __m256i neighbour)
+{
+    const __m256i up = _mm256_subs_epu8(y, neighbour);
+    const __m256i down = _mm256_subs_epu8(neighbour, y);
+    const __m256i relief = _mm256_subs_epu8(_mm256_adds_epu8(_mm256_set1_epi8(static_cast<char>(128)), up), down);
+    return _mm256_min_epu8(_mm256_max_epu8(relief, _mm256_set1_epi8(16)), _mm256_set1_epi8(static_cast<char>(235)));
+}
+
+[[gnu::always_inline]] inline __m256i TwoLevel(__m256i bytes, __m256i high, __m256i low)
+{
+    // b - 128 > 0 as signed bytes.
+    const __m256i middle = _mm256_set1_epi8(static_cast<char>(128));
+    const __m256i isAbove = _mm256_cmpgt_epi8(_mm256_xor_si256(bytes, middle), _mm256_setzero_si256());
+    return _mm256_blendv_epi8(low, high, isAbove);
+}
+
+[[gnu::always_inline]] inline __m256i Negated(__m256i bytes)
+{
+    return _mm256_sub_epi8(_mm256_setzero_si256(), bytes);
+}
+
+}  // namespace
+
+// These kernels work in place and cover a whole run of at least 32 bytes: the last 32 are worked
+// out from their first values before any store can reach them and stored after the loop, whose
+// own last step may have covered some of them with the same results.
+
 int EmbossRowAvx2(unsigned char* row, const unsigned char* below, int count)
 {
-    const __m256i middle = _mm256_set1_epi8(static_cast<char>(128));
-    const __m256i black = _mm256_set1_epi8(16);
-    const __m256i white = _mm256_set1_epi8(static_cast<char>(235));
-    int c = 0;
-    for (; c + 32 <= count; c += 32) {
-        const __m256i y = Load(row + c);
-        const __m256i neighbour = Load(below + c + 1);
-        const __m256i up = _mm256_subs_epu8(y, neighbour);
-        const __m256i down = _mm256_subs_epu8(neighbour, y);
-        const __m256i relief = _mm256_subs_epu8(_mm256_adds_epu8(middle, up), down);
-        Store(row + c, _mm256_min_epu8(_mm256_max_epu8(relief, black), white));
-    }
-    return c;
+    if (count < 32)
+        return 0;
+    const __m256i last = Relief(Load(row + count - 32), Load(below + count - 31));
+    for (int c = 0; c + 32 <= count; c += 32)
+        Store(row + c, Relief(Load(row + c), Load(below + c + 1)));
+    Store(row + count - 32, last);
+    return count;
 }
 
 int TwoLevelAvx2(unsigned char* bytes, int count, unsigned char above, unsigned char atOrBelow)
 {
-    const __m256i middle = _mm256_set1_epi8(static_cast<char>(128));
-    const __m256i zero = _mm256_setzero_si256();
+    if (count < 32)
+        return 0;
     const __m256i high = _mm256_set1_epi8(static_cast<char>(above));
     const __m256i low = _mm256_set1_epi8(static_cast<char>(atOrBelow));
-    int c = 0;
-    for (; c + 32 <= count; c += 32) {
-        // b - 128 > 0 as signed bytes.
-        const __m256i isAbove = _mm256_cmpgt_epi8(_mm256_xor_si256(Load(bytes + c), middle), zero);
-        Store(bytes + c, _mm256_blendv_epi8(low, high, isAbove));
-    }
-    return c;
+    const __m256i last = TwoLevel(Load(bytes + count - 32), high, low);
+    for (int c = 0; c + 32 <= count; c += 32)
+        Store(bytes + c, TwoLevel(Load(bytes + c), high, low));
+    Store(bytes + count - 32, last);
+    return count;
 }
 
 int NegateAvx2(unsigned char* bytes, int count)
 {
-    int c = 0;
-    for (; c + 32 <= count; c += 32)
-        Store(bytes + c, _mm256_sub_epi8(_mm256_setzero_si256(), Load(bytes + c)));
-    return c;
+    if (count < 32)
+        return 0;
+    const __m256i last = Negated(Load(bytes + count - 32));
+    for (int c = 0; c + 32 <= count; c += 32)
+        Store(bytes + c, Negated(Load(bytes + c)));
+    Store(bytes + count - 32, last);
+    return count;
 }
 
 int MirrorEndsAvx2(unsigned char* row, int length)
