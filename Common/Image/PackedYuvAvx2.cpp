@@ -71,6 +71,40 @@ int PackedPairToPlanar(PackedPairRows rows, int columns)
     return c;
 }
 
+// 32 pixels of a planar row, with their 16 chroma pairs, as 16 packed groups.
+template <int kLumaOffset>
+[[gnu::always_inline]] inline void Groups16(const unsigned char* y, const unsigned char* u, const unsigned char* v,
+                                            unsigned char* packed)
+{
+    const __m256i luma = Load(y);
+    const __m128i us = _mm_loadu_si128(reinterpret_cast<const __m128i*>(u));
+    const __m128i vs = _mm_loadu_si128(reinterpret_cast<const __m128i*>(v));
+    // The (U, V) pairs of groups 0-7 in the low lane, 8-15 in the high lane.
+    const __m256i chroma =
+        _mm256_inserti128_si256(_mm256_castsi128_si256(_mm_unpacklo_epi8(us, vs)), _mm_unpackhi_epi8(us, vs), 1);
+    // Pixels 0-7 | 16-23 and 8-15 | 24-31.
+    const __m256i low = kLumaOffset ? _mm256_unpacklo_epi8(chroma, luma) : _mm256_unpacklo_epi8(luma, chroma);
+    const __m256i high = kLumaOffset ? _mm256_unpackhi_epi8(chroma, luma) : _mm256_unpackhi_epi8(luma, chroma);
+    Store(packed, _mm256_permute2x128_si256(low, high, 0x20));
+    Store(packed + 32, _mm256_permute2x128_si256(low, high, 0x31));
+}
+
+template <int kLumaOffset>
+int PlanarRowToPacked(const unsigned char* y, const unsigned char* u, const unsigned char* v, unsigned char* packed,
+                      int columns)
+{
+    int c = 0;
+    for (; c + 64 <= columns; c += 64) {
+        Groups16<kLumaOffset>(y + c, u + c / 2, v + c / 2, packed + 2 * c);
+        Groups16<kLumaOffset>(y + c + 32, u + c / 2 + 16, v + c / 2 + 16, packed + 2 * c + 64);
+    }
+    if (c + 32 <= columns) {
+        Groups16<kLumaOffset>(y + c, u + c / 2, v + c / 2, packed + 2 * c);
+        c += 32;
+    }
+    return c;
+}
+
 }  // namespace
 
 int PackedToPlanarAvx2(const PackedPairRows& rows, int columns, int lumaOffset)
@@ -81,21 +115,7 @@ int PackedToPlanarAvx2(const PackedPairRows& rows, int columns, int lumaOffset)
 int PlanarToPackedAvx2(const unsigned char* y, const unsigned char* u, const unsigned char* v, unsigned char* packed,
                        int columns, int lumaOffset)
 {
-    int c = 0;
-    for (; c + 32 <= columns; c += 32) {
-        const __m256i luma = Load(y + c);
-        const __m128i us = _mm_loadu_si128(reinterpret_cast<const __m128i*>(u + c / 2));
-        const __m128i vs = _mm_loadu_si128(reinterpret_cast<const __m128i*>(v + c / 2));
-        // The (U, V) pairs of groups 0-7 in the low lane, 8-15 in the high lane.
-        const __m256i chroma =
-            _mm256_inserti128_si256(_mm256_castsi128_si256(_mm_unpacklo_epi8(us, vs)), _mm_unpackhi_epi8(us, vs), 1);
-        // Pixels 0-7 | 16-23 and 8-15 | 24-31.
-        const __m256i low = lumaOffset ? _mm256_unpacklo_epi8(chroma, luma) : _mm256_unpacklo_epi8(luma, chroma);
-        const __m256i high = lumaOffset ? _mm256_unpackhi_epi8(chroma, luma) : _mm256_unpackhi_epi8(luma, chroma);
-        Store(packed + 2 * c, _mm256_permute2x128_si256(low, high, 0x20));
-        Store(packed + 2 * c + 32, _mm256_permute2x128_si256(low, high, 0x31));
-    }
-    return c;
+    return lumaOffset ? PlanarRowToPacked<1>(y, u, v, packed, columns) : PlanarRowToPacked<0>(y, u, v, packed, columns);
 }
 
 int SwapPixelBytesAvx2(unsigned char* dst, const unsigned char* src, int pixels)
