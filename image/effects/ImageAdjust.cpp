@@ -1,6 +1,7 @@
 #include "image/effects/ImageAdjust.h"
 
 #include <algorithm>
+#include <climits>
 #include <cstdint>
 
 #include "image/effects/EffectRows.h"
@@ -114,8 +115,13 @@ void MapPlane(unsigned char* plane, int pitch, int columns, int rows, const Valu
 {
     static constexpr avpost::simd::Variants<avpost::detail::ValueMapKernel> kKernels{
         {MapValues, nullptr, nullptr, nullptr, avpost::detail::MapValuesAvx2}};
-    if (!Changes(map))
+    if (!Changes(map) || columns <= 0 || rows <= 0)
         return;
+    // Rows without gaps between them are one run.
+    if (pitch == columns && static_cast<int64_t>(columns) * rows <= INT_MAX) {
+        columns *= rows;
+        rows = 1;
+    }
     const avpost::detail::ValueMapKernel kernel = kKernels.Pick();
     for (int r = 0; r < rows; ++r) {
         unsigned char* row = RowOf(plane, pitch, r);
