@@ -26,6 +26,7 @@
 #include "image/output/JpegBitWriter.h"
 #include "image/output/JpegColour.h"
 #include "image/output/JpegTransform.h"
+#include "support/TraceLine.h"
 
 namespace {
 
@@ -247,7 +248,7 @@ bool Encoder::InitAll()
         BuildCategoryTables(categoryTable, bitcodeTable);
     } catch (const std::bad_alloc&) {
         ReleaseBuffers();
-        std::fputs("Not enough memory.", stdout);
+        avpost::detail::TraceLine("Not enough memory.");
         return false;
     }
 
