@@ -15,7 +15,7 @@ for arg in "$@"; do
   esac
 done
 
-packages=(cmake ninja-build g++ g++-multilib pkg-config googletest libgtest-dev libbenchmark-dev
+packages=(cmake ninja-build g++ g++-multilib pkg-config googletest libgtest-dev libbenchmark-dev dpkg-dev
           libjpeg62-turbo-dev
           # The command-line tool reads media files through FFmpeg's libraries; its tests use ffmpeg.
           libavformat-dev libavcodec-dev libswscale-dev libswresample-dev libavutil-dev ffmpeg

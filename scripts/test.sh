@@ -1,12 +1,13 @@
 #!/usr/bin/env bash
-# Builds and tests the library four ways: x86-64, 32-bit x86 (-m32), x86-64 with
-# AddressSanitizer and UndefinedBehaviorSanitizer, and the tests labelled "threads" under
-# ThreadSanitizer; then runs every fuzz target briefly over its kept corpus (clang's libFuzzer).
-# Exits non-zero on the first failure.
+# Builds and tests the library four ways: x86-64 (with its Debian packages, and a smoke run of
+# every benchmark), 32-bit x86 (-m32), x86-64 with AddressSanitizer and
+# UndefinedBehaviorSanitizer, and the tests labelled "threads" under ThreadSanitizer; then runs
+# every fuzz target briefly over its kept corpus (clang's libFuzzer). Exits non-zero on the first
+# failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-scripts/install-deps.sh --i386
+scripts/install-deps.sh --i386 --bench
 
 jobs=$(nproc)
 build_root=${AVPOST_BUILD_ROOT:-build}
@@ -21,7 +22,18 @@ variant() {
     ${test_label:+-L "${test_label}"}
 }
 
-variant x86-64 -DCMAKE_BUILD_TYPE=RelWithDebInfo
+# A few iterations of each benchmark, so that none can rot; the figures are printed, not judged.
+smoke_benchmarks() {
+  local bench
+  for bench in "${build_root}"/x86-64/benchmarks/*_bench "${build_root}"/x86-64/benchmarks/peers/peer_bench; do
+    [ -x "${bench}" ] || continue
+    echo "== smoke run of ${bench##*/} =="
+    "${bench}" --benchmark_min_time=0.001 --benchmark_repetitions=1
+  done
+}
+
+variant x86-64 -DCMAKE_BUILD_TYPE=RelWithDebInfo -DAVPOST_TEST_DEB_PACKAGES=ON
+smoke_benchmarks
 variant i386 -DCMAKE_BUILD_TYPE=RelWithDebInfo \
   -DCMAKE_TOOLCHAIN_FILE="$PWD/cmake/toolchains/i386-linux-gnu.cmake" -DAVPOST_BUILD_BENCHMARKS=OFF
 sanitizers="-fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer"

@@ -25,7 +25,10 @@ public:
     {
         ConsoleReporter::ReportRuns(runs);
         for (const Run& run : runs) {
-            if (run.run_type != Run::RT_Aggregate || run.aggregate_name != "median")
+            // The median of the repetitions; a run of one repetition has no aggregates.
+            const bool median = run.run_type == Run::RT_Aggregate && run.aggregate_name == "median";
+            const bool single = run.run_type == Run::RT_Iteration && run.repetitions <= 1;
+            if (!median && !single)
                 continue;
             const std::string& name = run.run_name.function_name;
             const size_t slash = name.rfind('/');
