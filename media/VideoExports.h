@@ -24,8 +24,8 @@ AVPOST_API void PCVideoRelease(VideoDecoder* stage);
 // Seeks any video stage; the time reached is discarded.
 AVPOST_API void PCVideoSeek(VideoDecoder* stage, double seconds, unsigned flags);
 
-// Settings of a stage made by PCVideoInit; any other kind of stage is ignored. None takes the
-// stage's lock except PCSetCropRect; the next picture uses them.
+// Settings of a stage made by PCVideoInit; any other kind of stage is ignored. The next picture
+// uses them; which of them take the stage's lock is said in media/Decoder.h.
 AVPOST_API void PCSetVideoBrightness(VideoDecoder* stage, int value);
 AVPOST_API void PCSetContrast(VideoDecoder* stage, int value);
 AVPOST_API void PCSetVideoSaturation(VideoDecoder* stage, int value);

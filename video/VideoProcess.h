@@ -20,11 +20,7 @@
 //
 // The source is not owned: it is never opened, closed by the destructor, or destroyed here.
 //
-// Threads: GetFrame, SetCropRect, SetUserWatermarkImage and CaptureImage hold the stage's
-// mutex for their whole run. The plain settings (brightness, contrast, saturation, filter,
-// flip, deinterlace, watermark enable, level and alignment) are single 32-bit words written
-// and read without the lock, each access atomic, so a change may take effect part-way through
-// a picture. The fixed-watermark setters take no lock either: call them between frames.
+// Which calls take the stage's lock, and how long its pictures stay valid: media/Decoder.h.
 class AVPOST_API VideoProcess : public VideoDecoder {
 public:
     // request may be null: then the output keeps the source's format. A frameRate between
@@ -42,10 +38,10 @@ public:
     const STREAM_INFO* GetStreamInfo() const override;
     double Seek(double seconds, unsigned flags) override;
     double GetOffset() const override;
-    // The processed picture, owned by the stage and valid until the next GetFrame (and across
-    // one output-size change by SetCropRect); the input's own picture while passing through;
-    // null when there is no picture or the input has no stream information. When the input has
-    // no picture, a kept last picture (keepLastFrame) is drawn anew in its place, resize included.
+    // The processed picture, owned by the stage (valid as media/Decoder.h says); the input's own
+    // picture while passing through; null when there is no picture or the input has no stream
+    // information. When the input has no picture, a kept last picture (keepLastFrame) is drawn
+    // anew in its place, resize included.
     MEDIA_FRAME* GetFrame() const override;
     int Forward(int count) override;
 
