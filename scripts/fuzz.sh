@@ -4,8 +4,9 @@
 #        scripts/fuzz.sh --all [SECONDS]    every target in turn, SECONDS each (CI runs a few each)
 #        scripts/fuzz.sh --list             the targets
 # Each target starts from its seed inputs and its kept findings (fuzz/regressions/TARGET/) and
-# grows a corpus in build/fuzz/corpus/TARGET/. A crash, a hang over one second, a leak, or an
-# allocation over 1 GiB stops the run with status 1 and names the reproducer, written to
+# grows a corpus in build/fuzz/corpus/TARGET/. A crash, a hang over one second (the time
+# AVPOST_FUZZ_TIMEOUT says, in seconds), a leak, or an allocation over 1 GiB stops the run with
+# status 1 and names the reproducer, written to
 # build/fuzz/findings/TARGET/. Once the cause is fixed, keep the reproducer as
 # fuzz/regressions/TARGET/<what-it-found>; the test suite replays it from then on.
 set -euo pipefail
@@ -40,7 +41,7 @@ run() {
   [ -f "fuzz/dictionaries/$target.dict" ] && dictionary=("-dict=fuzz/dictionaries/$target.dict")
   echo "== fuzz $target: ${seconds} s"
   if ! ASAN_OPTIONS=detect_leaks=1 "$program" "${dictionary[@]+"${dictionary[@]}"}" \
-      -max_total_time="$seconds" -timeout=1 -max_len=16384 -rss_limit_mb=2048 -malloc_limit_mb=1024 \
+      -max_total_time="$seconds" -timeout="${AVPOST_FUZZ_TIMEOUT:-1}" -max_len=16384 -rss_limit_mb=2048 -malloc_limit_mb=1024 \
       -artifact_prefix="$findings/" -print_final_stats=1 "$corpus" "$seeds" "$kept" >/dev/null 2>"$findings/log"; then
     tail -n 40 "$findings/log" >&2
     echo "fuzz $target found a problem; reproducer: $(ls -t "$findings" | grep -v '^log$' | head -n 1)" >&2
