@@ -6,13 +6,13 @@
 # Each target starts from its seed inputs and its kept findings (fuzz/regressions/TARGET/) and
 # grows a corpus in build/fuzz/corpus/TARGET/. A crash, a hang over one second (the time
 # AVPOST_FUZZ_TIMEOUT says, in seconds), a leak, or an allocation over 1 GiB stops the run with
-# status 1 and names the reproducer, written to
-# build/fuzz/findings/TARGET/. Once the cause is fixed, keep the reproducer as
-# fuzz/regressions/TARGET/<what-it-found>; the test suite replays it from then on.
+# status 1 and names the reproducer, written to build/fuzz/findings/TARGET/. Once the cause is
+# fixed, keep the reproducer as fuzz/regressions/TARGET/<what-it-found>; the test suite replays
+# it from then on.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-[ $# -ge 1 ] || { sed -n '2,10p' "$0" >&2; exit 2; }
+[ $# -ge 1 ] || { sed -n '2,11p' "$0" >&2; exit 2; }
 what=$1
 seconds=${2:-600}
 
