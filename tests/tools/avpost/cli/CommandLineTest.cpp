@@ -223,5 +223,25 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
         EXPECT_LE(end - at, 80u) << help.substr(at, end - at);
 }
 
+TEST(CommandLine, TheReadmesToolCommandsAreWhatTheToolTakes)
+{
+    const std::string readme = testing::ReadWholeFile(AVPOST_README);
+    const size_t section = readme.find("## The avpost tool");
+    ASSERT_NE(section, std::string::npos);
+    const std::string text = readme.substr(section, readme.find("\n## ", section + 1) - section);
+    int commands = 0;
+    bool inCode = false;
+    for (size_t at = 0, end; (end = text.find('\n', at)) != std::string::npos; at = end + 1) {
+        const std::string line = text.substr(at, end - at);
+        inCode = line.rfind("```", 0) == 0 ? !inCode : inCode;
+        if (!inCode || line.rfind("avpost ", 0) != 0)
+            continue;
+        const std::vector<std::string> words = Split(line.substr(7, line.find(" |") - 7), ' ');
+        EXPECT_NO_THROW(Parse(words)) << line;
+        commands += words[0] == "convert" ? 1 : 0;
+    }
+    EXPECT_GE(commands, 2);
+}
+
 }  // namespace
 }  // namespace avpost::tool
