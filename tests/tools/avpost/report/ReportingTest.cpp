@@ -6,6 +6,7 @@
 #include <thread>
 
 #include "ToolTestSupport.h"
+#include "tools/avpost/report/JsonReport.h"
 #include "tools/avpost/report/Progress.h"
 #include "tools/avpost/report/Summary.h"
 
@@ -65,6 +66,11 @@ TEST(RunSummaries, CountRepeatsDropsFillsAndTrims)
                                            "and 0.195 s of overlap; --continuous would repair them)");
     EXPECT_EQ(AudioSummary({6.004, 6.0, 0.0, 0.0, 44100, {6, kFivePointOneSide}, {}}, false),
               "6.00 s in, 6.00 s out at 44100 Hz 5.1");
+}
+
+TEST(RunSummaries, JsonStringsEscapeWhatWouldEndOrBreakThem)
+{
+    EXPECT_EQ(JsonString("a \"b\" c\\d\n\x01\xC3\xA9"), "\"a \\\"b\\\" c\\\\d\\u000a\\u0001\xC3\xA9\"");
 }
 
 }  // namespace
