@@ -43,5 +43,6 @@
 #include "image/output/JpegCoreProperties.h"
 #include "image/output/IjlObj.h"
 #include "support/TextEncoding.h"
+#include "support/Trace.h"
 
 #endif

@@ -1,7 +1,6 @@
 #include "audio/AudioConverter.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <cstring>
 #include <limits>
 #include <new>
@@ -10,6 +9,7 @@
 #include "audio/Interpolate.h"
 #include "media/Truncate.h"
 #include "support/Log.h"
+#include "support/TraceLine.h"
 
 using avpost::detail::TruncSaturate;
 
@@ -184,13 +184,13 @@ void CAudioConverter::Reset()
 void CAudioConverter::ChangeInput(int channels, int rate)
 {
     if (channels != inputChannels) {
-        std::printf(" *** CAudioConverter::ChangeInput %d => %d channels.\r\n", inputChannels, channels);
+        avpost::detail::TraceLine(" *** CAudioConverter::ChangeInput %d => %d channels.\r\n", inputChannels, channels);
         LogEx(L" *** CAudioConverter::ChangeInput %d => %d channels.", inputChannels, channels);
         valid = 0;
         inputChannels = channels;
     }
     if (rate != inputRate) {
-        std::printf(" *** CAudioConverter::ChangeInput %d => %d Hz.\r\n", inputRate, rate);
+        avpost::detail::TraceLine(" *** CAudioConverter::ChangeInput %d => %d Hz.\r\n", inputRate, rate);
         LogEx(L" *** CAudioConverter::ChangeInput %d => %d Hz.", inputRate, rate);
         valid = 0;
         inputRate = rate;

@@ -6,16 +6,20 @@
 #include "image/resize/ResizeGeometry.h"
 #include "image/resize/YuvFrameResize.h"
 #include "media/MediaFrame.h"
+#include "support/CpuFeatures.h"
 
 namespace {
 
 // One video picture resized between frames the way the video stage does it, full picture to
-// full picture. Arguments: source width and height, output width and height, interpolation.
+// full picture. Arguments: source width and height, output width and height, interpolation, and
+// the instruction-set level (0 scalar ... 4 AVX2, lowered to what the CPU runs).
 void BM_ImageResizeYUV(benchmark::State& state)
 {
     const int sw = static_cast<int>(state.range(0)), sh = static_cast<int>(state.range(1));
     const int dw = static_cast<int>(state.range(2)), dh = static_cast<int>(state.range(3));
     const auto interpolation = static_cast<IMAGE_INTERPOLATION>(state.range(4));
+    const avpost::simd::ScopedLevel level(static_cast<avpost::simd::Level>(state.range(5)));
+    state.SetLabel(avpost::simd::NameOf(avpost::simd::Active()));
     MEDIA_FRAME* src = CreateYV12Frame(sw, sh, false, true);
     MEDIA_FRAME* dst = CreateYV12Frame(dw, dh, false, true);
     IMG_PARAM srcParam{}, dstParam{};
@@ -31,10 +35,10 @@ void BM_ImageResizeYUV(benchmark::State& state)
     ReleaseYV12Frame(src);
 }
 BENCHMARK(BM_ImageResizeYUV)
-    ->ArgNames({"sw", "sh", "dw", "dh", "interp"})
-    ->Args({1920, 1080, 1280, 720, INTERPOLATION_BILINEAR})
-    ->Args({1920, 1080, 1280, 720, INTERPOLATION_NEAREST})
-    ->Args({720, 576, 1920, 1080, INTERPOLATION_BILINEAR})
+    ->ArgNames({"sw", "sh", "dw", "dh", "interp", "level"})
+    ->ArgsProduct({{1920}, {1080}, {1280}, {720}, {INTERPOLATION_BILINEAR, INTERPOLATION_NEAREST}, {0, 1, 2, 4}})
+    ->ArgsProduct({{720}, {576}, {1920}, {1080}, {INTERPOLATION_BILINEAR}, {0, 1, 2, 4}})
+    ->ArgsProduct({{1920}, {1080}, {480}, {270}, {INTERPOLATION_BILINEAR}, {0, 1, 2, 4}})
     ->Unit(benchmark::kMillisecond);
 
 // The still-picture path: bicubic enlargement of a 32-bit picture.

@@ -33,7 +33,8 @@ private:
 };
 
 // One kernel's variants, a slot per level; an empty slot falls back to the next lower level,
-// down to the reference in the first slot, which must be set.
+// down to the first slot: the reference, or null where the caller runs its reference itself
+// (the resize kernels pick a set of row functions here and keep their per-pixel reference).
 template <typename Function>
 struct Variants {
     Function at[kLevelCount];

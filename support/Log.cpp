@@ -5,10 +5,11 @@
 #include <cinttypes>
 #include <cstdarg>
 #include <cstdint>
-#include <cstdio>
+#include <cwchar>
 #include <string>
 
 #include "support/AppPath.h"
+#include "support/TraceLine.h"
 
 namespace {
 
@@ -31,7 +32,7 @@ void* LoadLogLibrary()
     if (directory[0] != '\0' && file.size() < static_cast<size_t>(kPathBytes))
         handle = dlopen(file.c_str(), RTLD_LAZY);
     if (handle == nullptr)
-        std::printf("dyLog: dlopen [%s] error.\r\n", file.c_str());
+        avpost::detail::TraceLine("dyLog: dlopen [%s] error.\r\n", file.c_str());
     return handle;
 }
 
@@ -54,10 +55,10 @@ void* LogGetAddress(const char* name)
         return entry;
     const uintptr_t handleValue = reinterpret_cast<uintptr_t>(handle);
     if (byName)
-        std::printf("dyLog: LogGetAddress [%s] [0x%" PRIxPTR "] error.\r\n", name, handleValue);
+        avpost::detail::TraceLine("dyLog: LogGetAddress [%s] [0x%" PRIxPTR "] error.\r\n", name, handleValue);
     else
-        std::printf("dyLog: LogGetAddress [%d] [0x%" PRIxPTR "] error.\r\n", static_cast<int>(nameValue),
-                    handleValue);
+        avpost::detail::TraceLine("dyLog: LogGetAddress [%d] [0x%" PRIxPTR "] error.\r\n",
+                                  static_cast<int>(nameValue), handleValue);
     return nullptr;
 }
 

@@ -1,6 +1,5 @@
 #include "video/VideoProcess.h"
 
-#include <cstring>
 #include <iterator>
 #include <limits>
 
@@ -10,6 +9,7 @@
 #include "image/resize/YuvFrameResize.h"
 #include "media/MediaFrame.h"
 #include "media/Truncate.h"
+#include "video/BlackBackground.h"
 #include "video/SharedSetting.h"
 #include "video/SingleLock.h"
 #include "video/VideoProcessHelpers.h"
@@ -17,14 +17,15 @@
 namespace {
 
 using avpost::detail::ChromaSize;
+using avpost::detail::ClearAround;
+using avpost::detail::ClearToBlack;
+using avpost::detail::ImageResizeYV12Coverage;
 using avpost::detail::LoadSetting;
 using avpost::detail::Release;
 using avpost::detail::Saturate32;
 using avpost::detail::SetWorkingRect;
 using avpost::detail::TruncSaturate;
 
-constexpr unsigned char kBlackLuma = 16;
-constexpr unsigned char kNeutralChroma = 128;
 constexpr uint32_t kFlipHorz = 1;
 constexpr uint32_t kFlipVert = 2;
 constexpr int32_t kCentred = 0;
@@ -68,14 +69,6 @@ bool EnsureFrame(MEDIA_FRAME*& frame, int32_t width, int32_t height, bool withAl
     Release(frame);
     frame = CreateYV12Frame(width, height, withAlpha, clear);
     return true;
-}
-
-void ClearToBlack(MEDIA_FRAME& frame)
-{
-    const size_t chromaRows = static_cast<size_t>(ChromaSize(frame.height));
-    std::memset(frame.plane[0], kBlackLuma, static_cast<size_t>(frame.height) * static_cast<size_t>(frame.pitch[0]));
-    std::memset(frame.plane[2], kNeutralChroma, chromaRows * static_cast<size_t>(frame.pitch[2]));
-    std::memset(frame.plane[1], kNeutralChroma, chromaRows * static_cast<size_t>(frame.pitch[1]));
 }
 
 // One coordinate of a rectangle given in fractions of the output: the product in single
@@ -163,31 +156,40 @@ MEDIA_FRAME* VideoProcess::GetFrame() const
     outputFrame->startTime = picture->startTime;
     outputFrame->streamTime = picture->streamTime;
     outputFrame->duration = picture->duration;
-    if (LoadSetting(brightness) != 0)
-        ClearToBlack(*outputFrame);
-
-    DrawMainPicture(*picture, sameSize && !forceResize);
+    // Brightness asks for a black background; the drawing clears only what it leaves.
+    DrawMainPicture(*picture, sameSize && !forceResize, LoadSetting(brightness) != 0);
     ApplyEffects();
     BlendUserWatermark();
     BlendWatermark();
     return outputFrame;
 }
 
-void VideoProcess::DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs) const
+void VideoProcess::DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs, bool onBlack) const
 {
     if (copyAsIs && cropRect == nullptr) {
         IMG_PARAM whole = {};
         SetWorkingRect(whole, 0, 0, outputFrame->width, outputFrame->height);
         if (Contains(picture, whole))
-            CopyVideoFrame(outputFrame, &picture, true);
+            CopyVideoFrame(outputFrame, &picture, true);  // every byte, pitch included
+        else if (onBlack)
+            ClearToBlack(*outputFrame);
         const DEINTERLACE_STYLE style = LoadSetting(deinterlaceStyle);
         if (Deinterlaces(style))
             DeinterlaceImage(outputFrame, style);
-    } else if (cropRect != nullptr) {
-        MakeCropImageEx();
     } else {
-        MakeResizeImage();
+        DrawScaled(onBlack);
     }
+}
+
+// What MakeResizeImage draws (on black), or MakeCropImageEx while a crop is set (over the previous
+// picture); with onBlack both draw on black, and the frame turns black even without a picture.
+void VideoProcess::DrawScaled(bool onBlack) const
+{
+    MEDIA_FRAME* picture = PictureForResize();
+    if (picture != nullptr)
+        DrawResized(picture, onBlack || cropRect == nullptr);
+    else if (onBlack)
+        ClearToBlack(*outputFrame);
 }
 
 void VideoProcess::MakeResizeImage() const
@@ -195,8 +197,7 @@ void VideoProcess::MakeResizeImage() const
     MEDIA_FRAME* picture = PictureForResize();
     if (outputFrame == nullptr || picture == nullptr)
         return;
-    ClearToBlack(*outputFrame);
-    DrawResized(picture);
+    DrawResized(picture, true);
 }
 
 void VideoProcess::MakeCropImageEx() const
@@ -204,15 +205,19 @@ void VideoProcess::MakeCropImageEx() const
     MEDIA_FRAME* picture = PictureForResize();
     if (outputFrame == nullptr || picture == nullptr || cropRect == nullptr)
         return;
-    DrawResized(picture);
+    DrawResized(picture, false);
 }
 
-void VideoProcess::DrawResized(MEDIA_FRAME* picture) const
+// With onBlack, everything the resize does not draw ends black, as if cleared before it.
+void VideoProcess::DrawResized(MEDIA_FRAME* picture, bool onBlack) const
 {
     srcParam.lpBits = picture->plane[0];
     dstParam.lpBits = outputFrame->plane[0];
-    if (!Contains(*picture, srcParam) || !Contains(*outputFrame, dstParam))
+    if (!Contains(*picture, srcParam) || !Contains(*outputFrame, dstParam)) {
+        if (onBlack)
+            ClearToBlack(*outputFrame);
         return;
+    }
     const DEINTERLACE_STYLE style = LoadSetting(deinterlaceStyle);
     if (Deinterlaces(style)) {
         EnsureFrame(deinterlaceFrame, picture->width, picture->height, false, false);
@@ -220,8 +225,11 @@ void VideoProcess::DrawResized(MEDIA_FRAME* picture) const
         DeinterlaceImage(deinterlaceFrame, style);
         picture = deinterlaceFrame;
     }
-    ImageResizeYUV(srcParam, picture, dstParam, outputFrame,
-                   resizeParam != nullptr ? resizeParam->interpolation : INTERPOLATION_BILINEAR);
+    const IMAGE_INTERPOLATION interpolation =
+        resizeParam != nullptr ? resizeParam->interpolation : INTERPOLATION_BILINEAR;
+    if (onBlack)
+        ClearAround(*outputFrame, ImageResizeYV12Coverage(srcParam, dstParam, interpolation));
+    ImageResizeYUV(srcParam, picture, dstParam, outputFrame, interpolation);
 }
 
 void VideoProcess::ApplyEffects() const

@@ -125,8 +125,9 @@ private:
     MEDIA_FRAME* InputPicture() const;
     MEDIA_FRAME* PictureForResize() const;
     void KeepCopy(const MEDIA_FRAME& picture) const;
-    void DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs) const;
-    void DrawResized(MEDIA_FRAME* picture) const;
+    void DrawMainPicture(const MEDIA_FRAME& picture, bool copyAsIs, bool onBlack) const;
+    void DrawScaled(bool onBlack) const;
+    void DrawResized(MEDIA_FRAME* picture, bool onBlack) const;
     void ApplyEffects() const;
     void BlendUserWatermark() const;
     void BlendWatermark() const;

@@ -1,14 +1,15 @@
 // The watermark setters of VideoProcess: each converts the host's bitmap once into a YUV 4:2:0
 // frame with alpha at the size it will be drawn; the frame path then only blends it.
 #include <cstdint>
-#include <cstdio>
 
 #include "image/effects/WatermarkPlanes.h"
+#include "support/TraceLine.h"
 #include "video/SharedSetting.h"
 #include "video/SingleLock.h"
 #include "video/VideoProcess.h"
 
 using avpost::detail::StoreSetting;
+using avpost::detail::TraceLine;
 using avpost::detail::WatermarkPlanes;
 
 namespace {
@@ -35,17 +36,16 @@ bool LoadWatermark(WatermarkPlanes& planes, const tagBITMAPINFO* bitmap, const u
     case WatermarkPlanes::Status::Loaded:
         return true;
     case WatermarkPlanes::Status::NoBitmap:
-        std::printf("Watermark format error. lpbi = 0\r\n");
+        TraceLine("Watermark format error. lpbi = 0\r\n");
         break;
     case WatermarkPlanes::Status::BadBitCount:
-        std::printf("Watermark format error BitCount = %d.\r\n", static_cast<int>(bitmap->bmiHeader.biBitCount));
+        TraceLine("Watermark format error BitCount = %d.\r\n", static_cast<int>(bitmap->bmiHeader.biBitCount));
         break;
     case WatermarkPlanes::Status::BadSize:
-        std::printf("Watermark format error. Size = %d x %d.\r\n", static_cast<int>(bitmap->bmiHeader.biWidth),
-                    static_cast<int>(bitmap->bmiHeader.biHeight));
+        TraceLine("Watermark format error. Size = %d x %d.\r\n", static_cast<int>(bitmap->bmiHeader.biWidth),
+                  static_cast<int>(bitmap->bmiHeader.biHeight));
         break;
     }
-    std::fflush(stdout);
     return false;
 }
 
@@ -90,11 +90,9 @@ void VideoProcess::SetWatermarkImageAlign(tagBITMAPINFO* bitmap, unsigned char* 
 
 void VideoProcess::SetWatermarkImage(tagBITMAPINFO* bitmap, unsigned char* bits, tagRECT* rect, int level)
 {
-    if (rect != nullptr) {
-        std::printf("\t\t (%d, %d, %d, %d)\r\n", static_cast<int>(rect->left), static_cast<int>(rect->top),
-                    static_cast<int>(rect->right), static_cast<int>(rect->bottom));
-        std::fflush(stdout);
-    }
+    if (rect != nullptr)
+        TraceLine("\t\t (%d, %d, %d, %d)\r\n", static_cast<int>(rect->left), static_cast<int>(rect->top),
+                  static_cast<int>(rect->right), static_cast<int>(rect->bottom));
     ReleaseFixedWatermark();
     StoreSetting(watermarkLevel, int32_t{level});
     PrepareFixedWatermark(bitmap, bits, rect);

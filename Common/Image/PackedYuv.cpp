@@ -5,6 +5,8 @@
 #include <cstring>
 
 #include "Common/Image/ColourArithmetic.h"
+#include "Common/Image/ConvertRows.h"
+#include "support/CpuFeatures.h"
 
 namespace avpost::detail {
 
@@ -24,6 +26,9 @@ class PackedRow {
 public:
     PackedRow(unsigned char* row, int lumaOffset) : row_(row), luma_(lumaOffset) {}
 
+    // The two bytes of pixel p, for the kernels when p starts a group.
+    unsigned char* At(int p) const { return row_ + 2 * p; }
+    int LumaOffset() const { return luma_; }
     int Y(int p) const { return row_[2 * p + luma_]; }
     int U(int p) const { return row_[4 * (p >> 1) + 1 - luma_]; }
     int V(int p) const { return row_[4 * (p >> 1) + 3 - luma_]; }
@@ -91,19 +96,71 @@ void ColumnsToPlanar(const PackedRow& top, const PackedRow& bottom, int x, int c
     v[c >> 1] = static_cast<unsigned char>((top.V(p) + bottom.V(p)) >> 1);
 }
 
+// The kernels' reference: whole groups of a row pair from a group boundary.
+int PackedPairToPlanar(const PackedPairRows& rows, int columns, int lumaOffset)
+{
+    const PackedRow top(const_cast<unsigned char*>(rows.top), lumaOffset);
+    const PackedRow bottom(const_cast<unsigned char*>(rows.bottom), lumaOffset);
+    int c = 0;
+    for (; c + 1 < columns; c += 2)
+        ColumnsToPlanar(top, bottom, 0, c, 2, rows.y0, rows.y1, rows.u, rows.v);
+    return c;
+}
+
 void RowPairToPlanar(const PackedRow& top, const PackedRow& bottom, int x, int cx, unsigned char* y0,
                      unsigned char* y1, unsigned char* u, unsigned char* v)
 {
+    static constexpr simd::Variants<PackedToPlanarKernel> kKernels{
+        {PackedPairToPlanar, nullptr, nullptr, nullptr, PackedToPlanarAvx2}};
     int c = 0;
+    if ((x & 1) == 0)
+        c = kKernels.Pick()(PackedPairRows{top.At(x), bottom.At(x), y0, y1, u, v}, cx, top.LumaOffset());
     for (; c + 1 < cx; c += 2)
         ColumnsToPlanar(top, bottom, x, c, 2, y0, y1, u, v);
     if (c < cx)
         ColumnsToPlanar(top, bottom, x, c, 1, y0, y1, u, v);
 }
 
+// The kernels' reference: one planar row into whole groups from a group boundary.
+int PlanarRowToPacked(const unsigned char* y, const unsigned char* u, const unsigned char* v, unsigned char* packed,
+                      int columns, int lumaOffset)
+{
+    const PackedRow out(packed, lumaOffset);
+    int c = 0;
+    for (; c + 1 < columns; c += 2)
+        out.PutGroup(c, y[c], y[c + 1], u[c >> 1], v[c >> 1]);
+    return c;
+}
+
 ChromaTerms GroupTerms(const PackedRow& in, int p)
 {
     return TableChromaTerms(in.U(p), in.V(p));
+}
+
+// The kernels' reference: whole groups from a group boundary into 24-bit pixels.
+int PackedGroupsToRgb24(const unsigned char* packed, unsigned char* bgr, int columns, int lumaOffset)
+{
+    const PackedRow in(const_cast<unsigned char*>(packed), lumaOffset);
+    int c = 0;
+    for (; c + 1 < columns; c += 2) {
+        const ChromaTerms t = GroupTerms(in, c);
+        TableYuvToBgr(in.Y(c), t, bgr + 3 * c);
+        TableYuvToBgr(in.Y(c + 1), t, bgr + 3 * c + 3);
+    }
+    return c;
+}
+
+// The kernels' reference: 24-bit pixels into whole groups from a group boundary.
+int Rgb24ToPackedGroups(const unsigned char* bgr, unsigned char* packed, int columns, int lumaOffset)
+{
+    const PackedRow out(packed, lumaOffset);
+    int c = 0;
+    for (; c + 1 < columns; c += 2) {
+        const LumaChroma a = TableRgbToYuv(bgr + 3 * c);
+        const LumaChroma b = TableRgbToYuv(bgr + 3 * c + 3);
+        out.PutGroup(c, a.y, b.y, ChromaOf2(a.du, b.du), ChromaOf2(a.dv, b.dv));
+    }
+    return c;
 }
 
 void PutLonePixel(const PackedRow& out, int p, const LumaChroma& a)
@@ -117,7 +174,7 @@ int ChromaColumnsUnder(int x, int cx)
     return (x + cx + 1) / 2 - (x + 1) / 2;
 }
 
-void SwapPixelBytes(unsigned char* dst, const unsigned char* src, int cx)
+int SwapPixelBytes(unsigned char* dst, const unsigned char* src, int cx)
 {
     for (int c = 0; c < cx; ++c) {
         const unsigned char first = src[2 * c];
@@ -125,6 +182,18 @@ void SwapPixelBytes(unsigned char* dst, const unsigned char* src, int cx)
         dst[2 * c] = second;
         dst[2 * c + 1] = first;
     }
+    return cx;
+}
+
+// The kernels read ahead of what they write, so they take rows that are the same or apart.
+void SwapRowPixelBytes(unsigned char* dst, const unsigned char* src, int cx)
+{
+    static constexpr simd::Variants<SwapPixelBytesKernel> kKernels{
+        {SwapPixelBytes, nullptr, nullptr, nullptr, SwapPixelBytesAvx2}};
+    const size_t bytes = 2 * static_cast<size_t>(cx);
+    const bool apart = dst == src || dst + bytes <= src || src + bytes <= dst;
+    const int done = apart ? kKernels.Pick()(dst, src, cx) : 0;
+    SwapPixelBytes(dst + 2 * done, src + 2 * done, cx - done);
 }
 
 }  // namespace
@@ -148,6 +217,9 @@ void PackedToPlanar(const PlanarRect& dstRect, const PackedRect& src, int cx, in
 
 void PlanarToPacked(const PackedRect& dst, const PlanarRect& srcRect, int cx, int cy)
 {
+    static constexpr simd::Variants<PlanarToPackedKernel> kKernels{
+        {PlanarRowToPacked, nullptr, nullptr, nullptr, PlanarToPackedAvx2}};
+    const PlanarToPackedKernel kernel = kKernels.Pick();
     const PlanarPicture src = AtRectangle(srcRect);
     const int luma = LumaOffset(dst.format);
     for (int k = 0; k < cy; ++k) {
@@ -155,13 +227,17 @@ void PlanarToPacked(const PackedRect& dst, const PlanarRect& srcRect, int cx, in
         const unsigned char* y = src.YRow(k);
         const unsigned char* u = src.URow(k >> 1);
         const unsigned char* v = src.VRow(k >> 1);
-        for (int c = 0; c < cx; ++c)
+        int c = (dst.x & 1) == 0 ? kernel(y, u, v, out.At(dst.x), cx, luma) : 0;
+        for (; c < cx; ++c)
             out.PutPixel(dst.x + c, y[c], u[c >> 1], v[c >> 1]);
     }
 }
 
 void PackedToRgb24(const RgbRect& dst, const PackedRect& src, int cx, int cy)
 {
+    static constexpr simd::Variants<PackedToRgb24Kernel> kKernels{
+        {PackedGroupsToRgb24, nullptr, nullptr, nullptr, PackedToRgb24Avx2}};
+    const PackedToRgb24Kernel kernel = kKernels.Pick();
     const int luma = LumaOffset(src.format);
     const RowRange rows = RowsInside(dst, cy);
     for (int r = rows.begin; r < rows.end; ++r) {
@@ -172,6 +248,7 @@ void PackedToRgb24(const RgbRect& dst, const PackedRect& src, int cx, int cy)
             TableYuvToBgr(in.Y(src.x), GroupTerms(in, src.x), out);
             c = 1;
         }
+        c += kernel(in.At(src.x + c), out + 3 * c, cx - c, luma);
         for (; c + 1 < cx; c += 2) {
             const int p = src.x + c;
             const ChromaTerms t = GroupTerms(in, p);
@@ -185,6 +262,9 @@ void PackedToRgb24(const RgbRect& dst, const PackedRect& src, int cx, int cy)
 
 void Rgb24ToPacked(const PackedRect& dst, const RgbRect& src, int cx, int cy)
 {
+    static constexpr simd::Variants<Rgb24ToPackedKernel> kKernels{
+        {Rgb24ToPackedGroups, nullptr, nullptr, nullptr, Rgb24ToPackedAvx2}};
+    const Rgb24ToPackedKernel kernel = kKernels.Pick();
     const int luma = LumaOffset(dst.format);
     const RowRange rows = RowsInside(src, cy);
     const bool lastGroupFits = 2 * (static_cast<int64_t>(dst.x) + cx) + 2 <= dst.pitch;
@@ -196,6 +276,7 @@ void Rgb24ToPacked(const PackedRect& dst, const RgbRect& src, int cx, int cy)
             PutLonePixel(out, dst.x, TableRgbToYuv(in));
             c = 1;
         }
+        c += kernel(in + 3 * c, out.At(dst.x + c), cx - c, luma);
         for (; c + 1 < cx; c += 2) {
             const LumaChroma a = TableRgbToYuv(in + 3 * c);
             const LumaChroma b = TableRgbToYuv(in + 3 * c + 3);
@@ -243,7 +324,7 @@ void CopyPackedRect(const PackedRect& dst, const PackedRect& src, int cx, int cy
         if (sameParity && !swap) {
             std::memmove(d + 2 * dst.x, s + 2 * src.x, 2 * static_cast<size_t>(cx));
         } else if (sameParity) {
-            SwapPixelBytes(d + 2 * dst.x, s + 2 * src.x, cx);
+            SwapRowPixelBytes(d + 2 * dst.x, s + 2 * src.x, cx);
         } else {
             // Even and odd columns hold different chroma samples, so each pixel takes the one
             // its new column holds from its old group.

@@ -2,7 +2,9 @@
 
 #include <cstring>
 
+#include "image/effects/EffectRows.h"
 #include "image/effects/PackedPicture.h"
+#include "support/CpuFeatures.h"
 
 using avpost::detail::PackedView;
 using avpost::detail::RowOf;
@@ -22,16 +24,27 @@ void DoubleField(unsigned char* plane, int columns, int rows, bool keepEven)
     }
 }
 
+// The kernels' reference.
+int AverageRows(unsigned char* row, const unsigned char* above, const unsigned char* below, int count)
+{
+    for (int c = 0; c < count; ++c)
+        row[c] = static_cast<unsigned char>((above[c] + below[c]) >> 1);
+    return count;
+}
+
 // Rows first, first + 2, ... that have a row below become the truncated average of their
 // neighbours, which belong to the kept field and are never written.
 void InterpolateField(unsigned char* plane, int columns, int rows, int first)
 {
+    static constexpr avpost::simd::Variants<avpost::detail::AverageRowsKernel> kKernels{
+        {AverageRows, nullptr, nullptr, nullptr, avpost::detail::AverageRowsAvx2}};
+    const avpost::detail::AverageRowsKernel kernel = kKernels.Pick();
     for (int k = first; k < rows - 1; k += 2) {
         const unsigned char* above = RowOf(plane, columns, k - 1);
         const unsigned char* below = RowOf(plane, columns, k + 1);
         unsigned char* row = RowOf(plane, columns, k);
-        for (int c = 0; c < columns; ++c)
-            row[c] = static_cast<unsigned char>((above[c] + below[c]) >> 1);
+        const int done = kernel(row, above, below, columns);
+        AverageRows(row + done, above + done, below + done, columns - done);
     }
 }
 

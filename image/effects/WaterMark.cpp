@@ -5,8 +5,11 @@
 #include <limits>
 #include <optional>
 
+#include "image/effects/EffectRows.h"
 #include "image/effects/PackedPicture.h"
+#include "support/CpuFeatures.h"
 
+using avpost::detail::ChromaBlendRows;
 using avpost::detail::PackedPicture;
 using avpost::detail::PackedView;
 using avpost::detail::RowOf;
@@ -73,30 +76,77 @@ unsigned char BlendTwice(int under, int over, int a)
     return static_cast<unsigned char>((kMaxAlpha - a) * under / kMaxAlpha + a * over / kMaxAlpha);
 }
 
+// The kernels' references.
+int BlendLuma(unsigned char* under, const unsigned char* over, const unsigned char* alpha, int count, int level,
+              int twoDivisions)
+{
+    for (int c = 0; c < count; ++c) {
+        const int a = Opacity(level, alpha[c]);
+        under[c] = twoDivisions ? BlendTwice(under[c], over[c], a) : BlendOnce(under[c], over[c], a);
+    }
+    return count;
+}
+
+int BlendChroma(const ChromaBlendRows& rows, int count, int level)
+{
+    for (int i = 0; i < count; ++i) {
+        const int a = Opacity(level, rows.alpha[2 * i]);
+        rows.u[i] = BlendOnce(rows.u[i], rows.overU[i], a);
+        rows.v[i] = BlendOnce(rows.v[i], rows.overV[i], a);
+    }
+    return count;
+}
+
+void BlendLumaRun(unsigned char* under, const unsigned char* over, const unsigned char* alpha, int count, int level,
+                  bool twoDivisions)
+{
+    static constexpr avpost::simd::Variants<avpost::detail::BlendLumaKernel> kKernels{
+        {BlendLuma, nullptr, nullptr, nullptr, avpost::detail::BlendLumaAvx2}};
+    const int done = kKernels.Pick()(under, over, alpha, count, level, twoDivisions);
+    BlendLuma(under + done, over + done, alpha + done, count - done, level, twoDivisions);
+}
+
+// `count` chroma samples from (u, v) on, under the watermark's from (overU, overV) on, with the
+// opacities of every other luma pixel from `alpha` on.
+void BlendChromaRun(ChromaBlendRows rows, int count, int level)
+{
+    static constexpr avpost::simd::Variants<avpost::detail::BlendChromaKernel> kKernels{
+        {BlendChroma, nullptr, nullptr, nullptr, avpost::detail::BlendChromaAvx2}};
+    const int done = kKernels.Pick()(rows, count, level);
+    BlendChroma({rows.u + done, rows.v + done, rows.overU + done, rows.overV + done, rows.alpha + 2 * done},
+                count - done, level);
+}
+
+// How many even numbers lie in [first, end), and the first of them.
+struct EvenRun {
+    int first;
+    int count;
+};
+
+EvenRun EvenIn(int first, int end)
+{
+    const int even = first + (first & 1);
+    return {even, even < end ? (end - even + 1) / 2 : 0};
+}
+
 void BlendClipped(const PackedPicture& dst, const Watermark& mark, Run cols, Run rows, int level)
 {
     const PackedPicture& src = mark.picture;
     for (int r = 0; r < rows.length; ++r) {
         const int dstRow = rows.frameStart + r;
         const int srcRow = rows.markStart + r;
-        unsigned char* y = dst.LumaRow(dstRow);
-        const unsigned char* yw = src.LumaRow(srcRow);
         const unsigned char* alpha = mark.AlphaRow(srcRow);
-        const bool chromaRow = dstRow % 2 == 0;
-        unsigned char* u = RowOf(dst.u, dst.chromaWidth, dstRow / 2);
-        unsigned char* v = RowOf(dst.v, dst.chromaWidth, dstRow / 2);
-        const unsigned char* uw = RowOf(src.u, src.chromaWidth, srcRow / 2);
-        const unsigned char* vw = RowOf(src.v, src.chromaWidth, srcRow / 2);
-        for (int c = 0; c < cols.length; ++c) {
-            const int dstCol = cols.frameStart + c;
-            const int srcCol = cols.markStart + c;
-            const int a = Opacity(level, alpha[srcCol]);
-            y[dstCol] = BlendOnce(y[dstCol], yw[srcCol], a);
-            if (chromaRow && dstCol % 2 == 0) {
-                u[dstCol / 2] = BlendOnce(u[dstCol / 2], uw[srcCol / 2], a);
-                v[dstCol / 2] = BlendOnce(v[dstCol / 2], vw[srcCol / 2], a);
-            }
-        }
+        BlendLumaRun(dst.LumaRow(dstRow) + cols.frameStart, src.LumaRow(srcRow) + cols.markStart,
+                     alpha + cols.markStart, cols.length, level, false);
+        // Chroma follows the even frame rows and columns.
+        const EvenRun chroma = EvenIn(cols.frameStart, cols.frameStart + cols.length);
+        if (dstRow % 2 != 0 || chroma.count == 0)
+            continue;
+        const int srcCol = cols.markStart + chroma.first - cols.frameStart;
+        const ptrdiff_t under = static_cast<ptrdiff_t>(dstRow / 2) * dst.chromaWidth + chroma.first / 2;
+        const ptrdiff_t over = static_cast<ptrdiff_t>(srcRow / 2) * src.chromaWidth + srcCol / 2;
+        BlendChromaRun({dst.u + under, dst.v + under, src.u + over, src.v + over, alpha + srcCol}, chroma.count,
+                       level);
     }
 }
 
@@ -138,23 +188,20 @@ void BlendAligned(const PackedPicture& dst, const Watermark& mark, Position at, 
     const PackedPicture& src = mark.picture;
     const Span rows = VisibleSpan(at.y, src.height - 1, dst.height);
     const Span cols = VisibleSpan(at.x, src.width, dst.width);
+    if (cols.first >= cols.end)
+        return;
     for (int r = rows.first; r < rows.end; ++r) {
-        unsigned char* y = dst.LumaRow(static_cast<int>(at.y + r));
-        const unsigned char* yw = src.LumaRow(r);
         const unsigned char* alpha = mark.AlphaRow(r);
+        BlendLumaRun(dst.LumaRow(static_cast<int>(at.y + r)) + at.x + cols.first, src.LumaRow(r) + cols.first,
+                     alpha + cols.first, cols.end - cols.first, level, true);
         const int64_t chromaRow = (at.y + 1) / 2 + r / 2;
-        const bool chromaInside = r % 2 == 0 && chromaRow >= 0 && chromaRow < dst.chromaHeight;
-        for (int c = cols.first; c < cols.end; ++c) {
-            const int dstCol = static_cast<int>(at.x + c);
-            const int a = Opacity(level, alpha[c]);
-            y[dstCol] = BlendTwice(y[dstCol], yw[c], a);
-            if (chromaInside && c % 2 == 0) {
-                const ptrdiff_t dstChroma = chromaRow * dst.chromaWidth + dstCol / 2;
-                const ptrdiff_t srcChroma = static_cast<ptrdiff_t>(r / 2) * src.chromaWidth + c / 2;
-                dst.u[dstChroma] = BlendOnce(dst.u[dstChroma], src.u[srcChroma], a);
-                dst.v[dstChroma] = BlendOnce(dst.v[dstChroma], src.v[srcChroma], a);
-            }
-        }
+        const EvenRun chroma = EvenIn(cols.first, cols.end);
+        if (r % 2 != 0 || chromaRow < 0 || chromaRow >= dst.chromaHeight || chroma.count == 0)
+            continue;
+        const ptrdiff_t under = chromaRow * dst.chromaWidth + (at.x + chroma.first) / 2;
+        const ptrdiff_t over = static_cast<ptrdiff_t>(r / 2) * src.chromaWidth + chroma.first / 2;
+        BlendChromaRun({dst.u + under, dst.v + under, src.u + over, src.v + over, alpha + chroma.first}, chroma.count,
+                       level);
     }
 }
 

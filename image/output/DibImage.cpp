@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <limits>
 #include <memory>
@@ -42,6 +43,10 @@ struct FileCloser {
     void operator()(std::FILE* f) const { std::fclose(f); }
 };
 
+struct FreeDeleter {
+    void operator()(unsigned char* p) const { std::free(p); }
+};
+
 }  // namespace
 
 int DibImage::Create(int width, int height, int bitCount)
@@ -60,8 +65,9 @@ int DibImage::Create(int width, int height, int bitCount)
     const size_t headerSize = kInfoHeaderSize + 4 * PaletteEntries(bitCount);
     std::unique_ptr<unsigned char[]> header(
         new (std::nothrow) unsigned char[std::max(headerSize, sizeof(tagBITMAPINFO))]());
-    std::unique_ptr<unsigned char[]> pixels(
-        new (std::nothrow) unsigned char[static_cast<size_t>(imageSize) + kSpareBytes]());
+    // calloc: memory fresh from the system is zero already and is not cleared again.
+    std::unique_ptr<unsigned char, FreeDeleter> pixels(
+        static_cast<unsigned char*>(std::calloc(static_cast<size_t>(imageSize) + kSpareBytes, 1)));
     if (!header || !pixels)
         return 0;
 
@@ -86,7 +92,7 @@ DibImage::~DibImage() { Clear(); }
 
 void DibImage::Clear()
 {
-    delete[] bits;
+    std::free(bits);
     delete[] reinterpret_cast<unsigned char*>(info);
     bits = nullptr;
     info = nullptr;

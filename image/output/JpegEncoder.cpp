@@ -1,15 +1,16 @@
 // Baseline JPEG encoder, read top to bottom:
-//   1. constant tables (quantisation, Huffman, zigzag, DCT scale factors)
+//   1. constant tables (quantisation, Huffman, coefficient order, DCT scale factors)
 //   2. the encoder's state
-//   3. the bit writer with byte stuffing
-//   4. table building
-//   5. reading the BMP into a block-padded, top-down picture
-//   6. one 8 x 8 block: colour conversion, DCT, quantisation, Huffman coding
-//   7. the marker segments
-//   8. a whole conversion, and the exported functions around the lock
+//   3. table building
+//   4. reading the BMP into a block-padded, top-down picture
+//   5. coding the blocks: a row of blocks is converted to YCbCr and transformed at once
+//      (JpegColour.h, JpegTransform.h), then each block is Huffman coded into the bit writer
+//      (JpegBitWriter.h)
+//   6. the marker segments
+//   7. a whole conversion, built in memory and written with one call, and the exported
+//      functions around the lock
 #include "image/output/JpegEncoder.h"
 
-#include <algorithm>
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
@@ -21,9 +22,15 @@
 #include <utility>
 #include <vector>
 
-#include "image/output/JpegEncoderInternals.h"
+#include "image/output/BlockPaddedBmp.h"
+#include "image/output/JpegBitWriter.h"
+#include "image/output/JpegColour.h"
+#include "image/output/JpegTransform.h"
+#include "support/TraceLine.h"
 
 namespace {
+
+using avpost::jpeg::zigzag;
 
 // ---------------------------------------------------------------------------------------------
 // 1. Constant tables
@@ -87,24 +94,22 @@ constexpr unsigned char std_ac_chrominance_values[162] = {
     0xf9, 0xfa,
 };
 
-// For each natural (row-major) index, its position in the zigzag sequence.
-constexpr unsigned char zigzag[64] = {
-    0,  1,  5,  6,  14, 15, 27, 28,
-    2,  4,  7,  13, 16, 26, 29, 42,
-    3,  8,  12, 17, 25, 30, 41, 43,
-    9,  11, 18, 24, 31, 40, 44, 53,
-    10, 19, 23, 32, 39, 45, 52, 54,
-    20, 22, 33, 38, 46, 51, 55, 60,
-    21, 34, 37, 47, 50, 56, 59, 61,
-    35, 36, 48, 49, 57, 58, 62, 63,
+// For each zigzag position, the natural index it holds.
+struct NaturalOrder {
+    unsigned char at[64];
 };
+constexpr NaturalOrder MakeNaturalOrder()
+{
+    NaturalOrder order{};
+    for (int i = 0; i < 64; ++i)
+        order.at[zigzag[i]] = static_cast<unsigned char>(i);
+    return order;
+}
+constexpr NaturalOrder kNaturalOrder = MakeNaturalOrder();
 
 // Scale factors that the AAN DCT leaves on its outputs, by row or column frequency.
 constexpr double kAanScale[8] = {1.0, 1.387039845, 1.306562965, 1.175875602,
                                  1.0, 0.785694958, 0.541196100, 0.275899379};
-
-constexpr unsigned short mask[16] = {1,    2,    4,    8,    16,   32,   64,    128,
-                                     256,  512,  1024, 2048, 4096, 8192, 16384, 32768};
 
 // Magnitude categories run over -32767 ... 32767.
 constexpr int kLargestMagnitude = 32767;
@@ -115,14 +120,19 @@ constexpr unsigned char kEndOfBlock = 0x00;
 constexpr unsigned char kSixteenZeros = 0xF0;
 constexpr size_t kMaxPathBytes = 511;  // the paths' buffers hold 512 bytes with the terminator
 
-constexpr size_t kBmpHeaderSize = 54;
-constexpr int kBmpBitCountOffset = 28;
 
 // ---------------------------------------------------------------------------------------------
 // 2. The encoder's state: one conversion at a time, under encoderMutex.
 
+// One component of a row of blocks: its samples, quantised coefficients and nonzero masks.
+struct ComponentRow {
+    explicit ComponentRow(size_t blocks) : samples(64 * blocks), coefficients(64 * blocks), nonzero(blocks) {}
+    std::vector<signed char> samples;
+    std::vector<short> coefficients;
+    std::vector<uint64_t> nonzero;
+};
+
 struct Encoder {
-    std::FILE* fp_jpeg_stream = nullptr;
     // The picture size, padded to multiples of 8 once loaded. Kept in 32 bits so that sizes
     // just below 65536 still pad correctly.
     uint32_t width = 0;
@@ -130,8 +140,8 @@ struct Encoder {
     std::unique_ptr<unsigned char[]> RGB_buffer;  // blue, green, red; top row first
     size_t rgbBufferSize = 0;
 
-    unsigned char bytenew = 0;
-    signed char bytepos = 7;
+    // The JPEG file being built: segments, then the entropy-coded data.
+    avpost::jpeg::JpegBitWriter writer;
 
     std::vector<unsigned char> categoryTable;  // indexed by value + kLargestMagnitude
     std::vector<bitstring> bitcodeTable;
@@ -146,30 +156,15 @@ struct Encoder {
     float fdtbl_Y[64] = {};
     float fdtbl_Cb[64] = {};
 
-    signed char YDU[64] = {};
-    signed char CbDU[64] = {};
-    signed char CrDU[64] = {};
-    short DU_DCT[64] = {};
-    short DU[64] = {};
-
-    int32_t YRtab[256] = {}, YGtab[256] = {}, YBtab[256] = {};
-    int32_t CbRtab[256] = {}, CbGtab[256] = {}, CbBtab[256] = {};
-    int32_t CrRtab[256] = {}, CrGtab[256] = {}, CrBtab[256] = {};
-
-    unsigned char category(int value) const { return categoryTable[value + kLargestMagnitude]; }
-    const bitstring& bitcode(int value) const { return bitcodeTable[value + kLargestMagnitude]; }
     bool TablesBuilt() const { return !categoryTable.empty(); }
     bool PictureLoaded() const { return RGB_buffer && rgbBufferSize == size_t{width} * height * 3; }
 
-    void PutByte(unsigned char byte);
+    void PutByte(unsigned char byte) { writer.PutByte(byte); }
     void PutWord(unsigned short word);
     void WriteBits(bitstring bits);
 
     bool InitAll();
     bool LoadBitmap(const char* path, unsigned short* pictureWidth, unsigned short* pictureHeight);
-    void LoadBlock(uint32_t x, uint32_t y);
-    void ProcessDU(const signed char* block, const float* divisors, int& predictor, const bitstring* dcTable,
-                   const bitstring* acTable);
     void MainEncoder();
 
     void WriteApp0();
@@ -179,20 +174,12 @@ struct Encoder {
     void WriteSos();
 
     int Convert(const char* bmpPath, const char* jpegPath);
+    void EncodeFile(unsigned short pictureWidth, unsigned short pictureHeight);
     void ReleaseBuffers();
 };
 
 std::mutex encoderMutex;
 Encoder encoder;
-
-// ---------------------------------------------------------------------------------------------
-// 3. Bit writer
-
-void Encoder::PutByte(unsigned char byte)
-{
-    if (fp_jpeg_stream != nullptr)
-        std::fputc(byte, fp_jpeg_stream);
-}
 
 void Encoder::PutWord(unsigned short word)
 {
@@ -200,26 +187,10 @@ void Encoder::PutWord(unsigned short word)
     PutByte(static_cast<unsigned char>(word & 0xFF));
 }
 
-// Fills bytenew from its most significant bit down; a completed FF byte is followed by a 00
-// byte so that it cannot be taken for a marker. Bits beyond the 16 of value count as zeros.
-void Encoder::WriteBits(bitstring bits)
-{
-    for (int bit = bits.length - 1; bit >= 0; --bit) {
-        if (bit < 16 && (bits.value & mask[bit]))
-            bytenew = static_cast<unsigned char>(bytenew | mask[bytepos]);
-        --bytepos;
-        if (bytepos < 0) {
-            PutByte(bytenew);
-            if (bytenew == 0xFF)
-                PutByte(0x00);
-            bytenew = 0;
-            bytepos = 7;
-        }
-    }
-}
+void Encoder::WriteBits(bitstring bits) { writer.PutBits(bits.value, bits.length); }
 
 // ---------------------------------------------------------------------------------------------
-// 4. Table building
+// 3. Table building
 
 unsigned char ScaledQuantizer(unsigned char standard)
 {
@@ -277,21 +248,8 @@ bool Encoder::InitAll()
         BuildCategoryTables(categoryTable, bitcodeTable);
     } catch (const std::bad_alloc&) {
         ReleaseBuffers();
-        std::fputs("Not enough memory.", stdout);
+        avpost::detail::TraceLine("Not enough memory.");
         return false;
-    }
-
-    // RGB to YCbCr in 16-bit fixed point (BT.601 full range).
-    for (int32_t i = 0; i < 256; ++i) {
-        YRtab[i] = 19595 * i;
-        YGtab[i] = 38470 * i;
-        YBtab[i] = 7471 * i;
-        CbRtab[i] = -11058 * i;
-        CbGtab[i] = -21708 * i;
-        CbBtab[i] = 32768 * i;
-        CrRtab[i] = 32768 * i;
-        CrGtab[i] = -27438 * i;
-        CrBtab[i] = -5328 * i;
     }
 
     // The divisors fold the DCT's scale factors and the factor 8 into the quantisers.
@@ -308,214 +266,108 @@ bool Encoder::InitAll()
 }
 
 // ---------------------------------------------------------------------------------------------
-// 5. Reading the BMP
+// 4. Reading the BMP (BlockPaddedBmp.h)
 
-uint32_t RoundUpTo8(uint32_t n) { return (n + 7) & ~uint32_t{7}; }
-
-struct FileCloser {
-    void operator()(std::FILE* f) const { std::fclose(f); }
-};
-using FilePtr = std::unique_ptr<std::FILE, FileCloser>;
-
-// The file must hold every pixel row it announces, so a damaged header cannot make us
-// allocate or encode a picture that is not there.
-bool HoldsPixelRows(const char* path, uint32_t pictureHeight, uint32_t fileRowBytes)
-{
-    std::error_code error;
-    const std::uintmax_t size = std::filesystem::file_size(path, error);
-    return !error && size >= kBmpHeaderSize + std::uintmax_t{pictureHeight} * fileRowBytes;
-}
-
-// Rows are read bottom row first, each widened to whole blocks by repeating its last pixel,
-// then put top row first; the bottom row is repeated down to a whole block row.
 bool Encoder::LoadBitmap(const char* path, unsigned short* pictureWidth, unsigned short* pictureHeight)
 {
-    FilePtr file(std::fopen(path, "rb"));
-    if (!file)
+    BlockPaddedPicture picture;
+    if (!ReadBlockPaddedBmp(path, picture))
         return false;
-    unsigned char header[kBmpHeaderSize];
-    if (std::fread(header, 1, kBmpHeaderSize, file.get()) != kBmpHeaderSize || header[0] != 'B' ||
-        header[1] != 'M' || header[kBmpBitCountOffset] != 24)
-        return false;
-
-    const uint32_t w = header[18] + 256u * header[19];
-    const uint32_t h = header[22] + 256u * header[23];
-    const uint32_t rowBytes = w * 3;
-    const uint32_t padBytes = rowBytes % 4 == 0 ? 0 : 4 - rowBytes % 4;
-    if (!HoldsPixelRows(path, h, rowBytes + padBytes))
-        return false;
-
-    const uint32_t w8 = RoundUpTo8(w);
-    const uint32_t h8 = RoundUpTo8(h);
-    const uint64_t bufferBytes = uint64_t{w8} * h8 * 3;
-    if (bufferBytes > SIZE_MAX)
-        return false;
-    std::unique_ptr<unsigned char[]> buffer(new (std::nothrow) unsigned char[static_cast<size_t>(bufferBytes)]);
-    if (!buffer)
-        return false;
-
-    const size_t bufferRow = size_t{w8} * 3;
-    for (uint32_t r = 0; r < h; ++r) {
-        unsigned char* row = buffer.get() + r * bufferRow;
-        unsigned char padding[3];
-        if (std::fread(row, 1, rowBytes, file.get()) != rowBytes ||
-            std::fread(padding, 1, padBytes, file.get()) != padBytes)
-            return false;
-        for (uint32_t col = w; col < w8; ++col)
-            std::memcpy(row + col * 3, row + (w - 1) * 3, 3);
-    }
-    for (uint32_t top = 0, bottom = h; top + 1 < bottom; ++top, --bottom)
-        std::swap_ranges(buffer.get() + top * bufferRow, buffer.get() + (top + 1) * bufferRow,
-                         buffer.get() + (bottom - 1) * bufferRow);
-    for (uint32_t r = h; r < h8; ++r)
-        std::memcpy(buffer.get() + r * bufferRow, buffer.get() + (h - 1) * bufferRow, bufferRow);
-
-    RGB_buffer = std::move(buffer);
-    rgbBufferSize = static_cast<size_t>(bufferBytes);
-    width = w8;
-    height = h8;
+    RGB_buffer = std::move(picture.pixels);
+    rgbBufferSize = picture.Bytes();
+    width = picture.paddedWidth;
+    height = picture.paddedHeight;
     if (pictureWidth != nullptr)
-        *pictureWidth = static_cast<unsigned short>(w);
+        *pictureWidth = static_cast<unsigned short>(picture.width);
     if (pictureHeight != nullptr)
-        *pictureHeight = static_cast<unsigned short>(h);
+        *pictureHeight = static_cast<unsigned short>(picture.height);
     return true;
 }
 
 // ---------------------------------------------------------------------------------------------
-// 6. One 8 x 8 block
+// 5. Coding the blocks
 
-// Luma is level-shifted by 128; the chroma products already centre on 0. The shifts are
-// arithmetic, rounding toward minus infinity.
-void Encoder::LoadBlock(uint32_t x, uint32_t y)
-{
-    for (int pos = 0; pos < 64; ++pos) {
-        const size_t location = (size_t{y} + pos / 8) * width * 3 + (size_t{x} + pos % 8) * 3;
-        const unsigned char blue = RGB_buffer[location];
-        const unsigned char green = RGB_buffer[location + 1];
-        const unsigned char red = RGB_buffer[location + 2];
-        YDU[pos] = static_cast<signed char>(((YRtab[red] + YGtab[green] + YBtab[blue]) >> 16) - 128);
-        CbDU[pos] = static_cast<signed char>((CbRtab[red] + CbGtab[green] + CbBtab[blue]) >> 16);
-        CrDU[pos] = static_cast<signed char>((CrRtab[red] + CrGtab[green] + CrBtab[blue]) >> 16);
-    }
-}
+// Codes quantised blocks into a cursor. Holds copies of what the inner loop reads, so that
+// nothing is read again after each byte written.
+struct BlockCoder {
+    const unsigned char* category;  // both indexed by values -32767 ... 32767
+    const bitstring* bitcode;
+    avpost::jpeg::BitCursor cursor;
 
-// One-dimensional AAN DCT over eight values step apart.
-void DctPass(float* d, int step)
-{
-    constexpr float c4 = 0.707106781f;  // cos(4 pi / 16)
-    constexpr float r2c6 = 0.382683433f;
-    constexpr float c2mc6 = 0.541196100f;
-    constexpr float c2pc6 = 1.306562965f;
-
-    const float tmp0 = d[0] + d[7 * step];
-    const float tmp7 = d[0] - d[7 * step];
-    const float tmp1 = d[step] + d[6 * step];
-    const float tmp6 = d[step] - d[6 * step];
-    const float tmp2 = d[2 * step] + d[5 * step];
-    const float tmp5 = d[2 * step] - d[5 * step];
-    const float tmp3 = d[3 * step] + d[4 * step];
-    const float tmp4 = d[3 * step] - d[4 * step];
-
-    // Even part.
-    const float tmp10 = tmp0 + tmp3;
-    const float tmp13 = tmp0 - tmp3;
-    const float tmp11 = tmp1 + tmp2;
-    const float tmp12 = tmp1 - tmp2;
-    d[0] = tmp10 + tmp11;
-    d[4 * step] = tmp10 - tmp11;
-    const float z1 = (tmp12 + tmp13) * c4;
-    d[2 * step] = tmp13 + z1;
-    d[6 * step] = tmp13 - z1;
-
-    // Odd part.
-    const float odd10 = tmp4 + tmp5;
-    const float odd11 = tmp5 + tmp6;
-    const float odd12 = tmp6 + tmp7;
-    const float z5 = (odd10 - odd12) * r2c6;
-    const float z2 = c2mc6 * odd10 + z5;
-    const float z4 = c2pc6 * odd12 + z5;
-    const float z3 = odd11 * c4;
-    const float z11 = tmp7 + z3;
-    const float z13 = tmp7 - z3;
-    d[5 * step] = z13 + z2;
-    d[3 * step] = z13 - z2;
-    d[1 * step] = z11 + z4;
-    d[7 * step] = z11 - z4;
-}
-
-// Single-precision Arai-Agui-Nakajima DCT in place, rows first, then columns. The outputs
-// carry the AAN scale factors, which the quantisation divisors remove.
-void ForwardDctAan(float block[64])
-{
-    for (int row = 0; row < 8; ++row)
-        DctPass(block + 8 * row, 1);
-    for (int col = 0; col < 8; ++col)
-        DctPass(block + col, 8);
-}
-
-void Encoder::ProcessDU(const signed char* block, const float* divisors, int& predictor, const bitstring* dcTable,
-                        const bitstring* acTable)
-{
-    float coefficients[64];
-    for (int i = 0; i < 64; ++i)
-        coefficients[i] = block[i];
-    ForwardDctAan(coefficients);
-    for (int i = 0; i < 64; ++i)
-        DU_DCT[i] = avpost::detail::QuantizeCoefficient(coefficients[i], divisors[i]);
-    for (int i = 0; i < 64; ++i)
-        DU[zigzag[i]] = DU_DCT[i];
-
-    const int diff = DU[0] - predictor;
-    predictor = DU[0];
-    if (diff == 0) {
-        WriteBits(dcTable[0]);
-    } else {
-        WriteBits(dcTable[category(diff)]);
-        WriteBits(bitcode(diff));
+    // The Huffman code of the value's category among codes, then the value's extra bits.
+    void PutCoded(const bitstring* codes, int value)
+    {
+        const bitstring code = codes[category[value]];
+        const bitstring extra = bitcode[value];
+        cursor.Put((uint32_t{code.value} << extra.length) | extra.value, code.length + extra.length);
     }
 
-    int end = 63;
-    while (end > 0 && DU[end] == 0)
-        --end;
-    if (end == 0) {
-        WriteBits(acTable[kEndOfBlock]);
-        return;
+    void PutCode(const bitstring& code) { cursor.Put(code.value, code.length); }
+
+    // du: quantised coefficients in natural order; nonzero: bit k set when zigzag position k is
+    // not 0. The DC codes its difference from the predictor (a difference of 0 is category 0
+    // with no extra bits); each nonzero AC value codes the run of zeros before it, in whole runs
+    // of sixteen first; an end-of-block code follows unless the last position is nonzero.
+    void Code(const short* du, uint64_t nonzero, int& predictor, const bitstring* dcTable, const bitstring* acTable)
+    {
+        const int diff = du[0] - predictor;
+        predictor = du[0];
+        PutCoded(dcTable, diff);
+
+        uint64_t ac = nonzero & ~uint64_t{1};
+        int previous = 0;
+        while (ac != 0) {
+            const int position = __builtin_ctzll(ac);
+            int zeros = position - previous - 1;
+            for (; zeros >= 16; zeros -= 16)
+                PutCode(acTable[kSixteenZeros]);
+            PutCoded(acTable + zeros * 16, du[kNaturalOrder.at[position]]);
+            previous = position;
+            ac &= ac - 1;
+        }
+        if (previous != 63)
+            PutCode(acTable[kEndOfBlock]);
     }
-    for (int i = 1; i <= end;) {
-        const int start = i;
-        while (DU[i] == 0)
-            ++i;
-        int zeros = i - start;
-        for (; zeros >= 16; zeros -= 16)
-            WriteBits(acTable[kSixteenZeros]);
-        WriteBits(acTable[zeros * 16 + category(DU[i])]);
-        WriteBits(bitcode(DU[i]));
-        ++i;
-    }
-    if (end != 63)
-        WriteBits(acTable[kEndOfBlock]);
-}
+};
+
+// A block codes at most 2021 bits (DC 31, 63 AC values of 31 each, three runs of sixteen zeros
+// of 11, end of block 4); with up to 63 bits pending before it, at most 32 words leave, each
+// eight bytes possibly stuffed.
+constexpr size_t kMostBytesPerBlock = 32 * 16;
 
 // Interleaved scan: one block of Y, Cb and Cr per minimum coded unit, no restart markers.
+// Colour conversion and transforms run over a whole row of blocks before it is coded.
 void Encoder::MainEncoder()
 {
     if (!TablesBuilt() || !PictureLoaded())
         return;
+    const int blocks = static_cast<int>(width / 8);
+    ComponentRow y(width / 8), cb(width / 8), cr(width / 8);
+    const avpost::jpeg::ColourBlockRowFunction convert = avpost::jpeg::PickColourBlockRow();
+    const avpost::jpeg::TransformBlocksFunction transform = avpost::jpeg::PickTransformBlocks();
+    const size_t rowBytes = size_t{width} * 3;
     int predictorY = 0;
     int predictorCb = 0;
     int predictorCr = 0;
-    for (uint32_t y = 0; y < height; y += 8) {
-        for (uint32_t x = 0; x < width; x += 8) {
-            LoadBlock(x, y);
-            ProcessDU(YDU, fdtbl_Y, predictorY, YDC_HT, YAC_HT);
-            ProcessDU(CbDU, fdtbl_Cb, predictorCb, CbDC_HT, CbAC_HT);
-            ProcessDU(CrDU, fdtbl_Cb, predictorCr, CbDC_HT, CbAC_HT);
+    for (uint32_t top = 0; top < height; top += 8) {
+        convert(RGB_buffer.get() + top * rowBytes, rowBytes, blocks, y.samples.data(), cb.samples.data(),
+                cr.samples.data());
+        transform(y.samples.data(), blocks, fdtbl_Y, y.coefficients.data(), y.nonzero.data());
+        transform(cb.samples.data(), blocks, fdtbl_Cb, cb.coefficients.data(), cb.nonzero.data());
+        transform(cr.samples.data(), blocks, fdtbl_Cb, cr.coefficients.data(), cr.nonzero.data());
+        BlockCoder coder{categoryTable.data() + kLargestMagnitude, bitcodeTable.data() + kLargestMagnitude,
+                         writer.Begin(3 * kMostBytesPerBlock * (width / 8))};
+        for (int b = 0; b < blocks; ++b) {
+            coder.Code(&y.coefficients[64 * b], y.nonzero[b], predictorY, YDC_HT, YAC_HT);
+            coder.Code(&cb.coefficients[64 * b], cb.nonzero[b], predictorCb, CbDC_HT, CbAC_HT);
+            coder.Code(&cr.coefficients[64 * b], cr.nonzero[b], predictorCr, CbDC_HT, CbAC_HT);
         }
+        writer.End(coder.cursor);
     }
 }
 
 // ---------------------------------------------------------------------------------------------
-// 7. Marker segments (16-bit fields most significant byte first)
+// 6. Marker segments (16-bit fields most significant byte first)
 
 void Encoder::WriteApp0()
 {
@@ -593,7 +445,7 @@ void Encoder::WriteSos()
 }
 
 // ---------------------------------------------------------------------------------------------
-// 8. A whole conversion
+// 7. A whole conversion
 
 void Encoder::ReleaseBuffers()
 {
@@ -601,15 +453,47 @@ void Encoder::ReleaseBuffers()
     rgbBufferSize = 0;
     categoryTable = std::vector<unsigned char>();
     bitcodeTable = std::vector<bitstring>();
+    writer.Release();
 }
 
-// Frees the picture and the value tables on every way out of a conversion.
+// Frees the picture, the value tables and the file's bytes on every way out of a conversion.
 struct BufferRelease {
     Encoder& encoder;
     ~BufferRelease() { encoder.ReleaseBuffers(); }
 };
 
 bool UsablePath(const char* path) { return path != nullptr && std::strlen(path) <= kMaxPathBytes; }
+
+void Encoder::EncodeFile(unsigned short pictureWidth, unsigned short pictureHeight)
+{
+    writer.Reset();
+    PutWord(0xFFD8);  // SOI
+    WriteApp0();
+    WriteDqt();
+    WriteSof0(pictureWidth, pictureHeight);
+    WriteDht();
+    WriteSos();
+    MainEncoder();
+    writer.PadWithOnes();
+    PutWord(0xFFD9);  // EOI
+}
+
+// One write. A regular file that could not be written whole is removed; anything else (a
+// device, a pipe) is not ours to remove.
+int WriteWholeFile(const char* path, const unsigned char* bytes, size_t size)
+{
+    std::FILE* file = std::fopen(path, "wb");
+    if (file == nullptr)
+        return EOF;
+    const bool written = std::fwrite(bytes, 1, size, file) == size;
+    const int closed = std::fclose(file);
+    if (written && closed == 0)
+        return 0;
+    std::error_code error;
+    if (std::filesystem::is_regular_file(path, error))
+        std::remove(path);
+    return EOF;
+}
 
 int Encoder::Convert(const char* bmpPath, const char* jpegPath)
 {
@@ -622,43 +506,15 @@ int Encoder::Convert(const char* bmpPath, const char* jpegPath)
     BufferRelease release{*this};
     if (!InitAll())
         return EOF;
-    fp_jpeg_stream = std::fopen(jpegPath, "wb");
-    if (fp_jpeg_stream == nullptr)
+    try {
+        EncodeFile(pictureWidth, pictureHeight);
+    } catch (const std::bad_alloc&) {
         return EOF;
-
-    PutWord(0xFFD8);  // SOI
-    WriteApp0();
-    WriteDqt();
-    WriteSof0(pictureWidth, pictureHeight);
-    WriteDht();
-    WriteSos();
-
-    bytenew = 0;
-    bytepos = 7;
-    MainEncoder();
-    // bytepos is never negative here, so a byte-aligned scan still gets one byte of ones.
-    if (bytepos >= 0) {
-        const int fill = bytepos + 1;
-        WriteBits({static_cast<unsigned char>(fill), static_cast<unsigned short>((1 << fill) - 1)});
     }
-    PutWord(0xFFD9);  // EOI
-
-    const int closed = std::fclose(fp_jpeg_stream);
-    fp_jpeg_stream = nullptr;
-    return closed;
+    return WriteWholeFile(jpegPath, writer.data(), writer.size());
 }
 
 }  // namespace
-
-namespace avpost::detail {
-
-short QuantizeCoefficient(float coefficient, float divisor)
-{
-    const float product = coefficient * divisor;
-    return static_cast<short>(static_cast<int>(static_cast<double>(product) + 16384.5) - 16384);
-}
-
-}  // namespace avpost::detail
 
 int BMP2JPEG(const char* bmpPath, const char* jpegPath)
 {
@@ -678,16 +534,25 @@ void init_all()
     encoder.InitAll();
 }
 
+// Outside a conversion the coded bytes go nowhere; a partly filled byte stays for the next call.
 void main_encoder()
 {
     std::lock_guard<std::mutex> lock(encoderMutex);
-    encoder.MainEncoder();
+    try {
+        encoder.MainEncoder();
+    } catch (const std::bad_alloc&) {
+    }
+    encoder.writer.DropBytes();
 }
 
 void writebits(bitstring bits)
 {
     std::lock_guard<std::mutex> lock(encoderMutex);
-    encoder.WriteBits(bits);
+    try {
+        encoder.WriteBits(bits);
+    } catch (const std::bad_alloc&) {
+    }
+    encoder.writer.DropBytes();
 }
 
 int FetchMatrix(int height, int width, const unsigned char* plane, signed char* block, int x, int y, int fill)

@@ -19,14 +19,15 @@ struct bitstring {
 // Converts the BMP file into a JPEG file. Returns 0 when the BMP cannot be used (cannot be
 // opened, shorter than its header and pixel rows, not "BM", not 24 bits per pixel, no memory
 // for the picture) or either name is null or longer than 511 bytes; nothing is written then.
-// When the JPEG file cannot be created or memory for the tables is missing, returns EOF and
-// writes nothing. Otherwise returns the result of closing the JPEG file, 0 on a normal close.
+// The JPEG is built in memory and written with one call: when memory is missing or the file
+// cannot be created or written whole, returns EOF, and a partly written file is removed.
+// Otherwise returns the result of closing the JPEG file, 0.
 AVPOST_API int BMP2JPEG(const char* bmpPath, const char* jpegPath);
 
 // The steps of a conversion, for hosts that drive them one by one. They share the encoder's
 // state: load_bitmap reads a BMP into the picture buffer (padded to whole 8 x 8 blocks by
 // repeating the last column and row) and reports its own size; init_all builds the tables;
-// main_encoder codes every block through writebits, which appends bits to the JPEG file of the
+// main_encoder codes every block through writebits, which appends bits to the JPEG of the
 // conversion in progress (outside a conversion, completed bytes go nowhere). main_encoder
 // does nothing without a loaded picture and built tables.
 AVPOST_API int load_bitmap(const char* path, unsigned short* pictureWidth, unsigned short* pictureHeight);

@@ -26,12 +26,14 @@ std::string Utf8Name(const wchar_t* path, size_t limit)
     return buffer;
 }
 
+// The bitmap is freed once written, so the encoder's copy of the picture can take its memory.
 int SaveAsJpeg(DibImage& image, const std::string& jpegName)
 {
     const std::string temporaryName = jpegName + kTemporarySuffix;
     if (temporaryName.size() >= kNameBuffer)
         return 0;
     const int written = image.Save(temporaryName.c_str());
+    image.Clear();
     BMP2JPEG(temporaryName.c_str(), jpegName.c_str());
     // Removed through the C library: the name never reaches a shell.
     std::remove(temporaryName.c_str());

@@ -1,6 +1,7 @@
 #include "image/resize/ChromaResizeKernels.h"
 
 #include "image/resize/FixedPointWalk.h"
+#include "image/resize/PlannedKernels.h"
 
 using namespace avpost::detail;
 
@@ -48,24 +49,28 @@ void WalkChromaRows(const IMG_PARAM& src, const IMG_PARAM& dst, Row row)
     CopyNearestChromaRow(TopDownRow(src, Chroma(LastRow(src))), src, dst, steps.x, TopDownRow(dst, Chroma(yy)));
 }
 
+void NearUV(const IMG_PARAM& src, const IMG_PARAM& dst)
+{
+    WalkChromaRows(src, dst, [&](unsigned char* out, int32_t r, int32_t, int32_t stepX) {
+        CopyNearestChromaRow(TopDownRow(src, Chroma(r)), src, dst, stepX, out);
+    });
+}
+
+void BiLinerUV(const IMG_PARAM& src, const IMG_PARAM& dst)
+{
+    WalkChromaRows(src, dst, [&](unsigned char* out, int32_t r, int32_t wy, int32_t stepX) {
+        BlendChromaRows(r, wy, src, dst, stepX, out);
+    });
+}
+
 }  // namespace
 
 int DIB_ResizeNearUV(const IMG_PARAM& src, IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
-    WalkChromaRows(src, dst, [&](unsigned char* out, int32_t r, int32_t, int32_t stepX) {
-        CopyNearestChromaRow(TopDownRow(src, Chroma(r)), src, dst, stepX, out);
-    });
-    return 1;
+    return RunFastest(CanStep(src, dst), NearUV, PlannedNearUV, src, dst);
 }
 
 int DIB_ResizeBiLinerUV(const IMG_PARAM& src, IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
-    WalkChromaRows(src, dst, [&](unsigned char* out, int32_t r, int32_t wy, int32_t stepX) {
-        BlendChromaRows(r, wy, src, dst, stepX, out);
-    });
-    return 1;
+    return RunFastest(CanStep(src, dst), BiLinerUV, PlannedBiLinerUV, src, dst);
 }

@@ -1,11 +1,11 @@
 #include "image/resize/DibResizeKernels.h"
 
-#include <algorithm>
 #include <cstring>
 #include <vector>
 
 #include "image/resize/DibEdgeWalk.h"
 #include "image/resize/FixedPointWalk.h"
+#include "image/resize/PlannedKernels.h"
 
 using namespace avpost::detail;
 
@@ -24,20 +24,11 @@ void CopyGreyPixel(unsigned char* dstRow, int32_t dstColumn, const unsigned char
     dstRow[dstColumn] = srcRow[srcColumn];
 }
 
-// Entry k of a nearest table: first + (k x srcSpan + dstSpan / 2) / dstSpan, rounding to the
-// nearest source index; the last entry is the source's last index. When enlarging, the rounding
-// can land one index past the source rectangle: that read stays, unless it would leave the
-// picture (pictureSpan indices), where the picture's last index is read instead.
 std::vector<int32_t> NearestIndexTable(int32_t first, int32_t srcSpan, int32_t dstSpan, int32_t pictureSpan)
 {
-    const int32_t last = first + srcSpan - 1;
-    const int64_t limit = std::max<int64_t>(last, int64_t{pictureSpan} - 1);
     std::vector<int32_t> table(static_cast<size_t>(dstSpan));
-    for (int32_t k = 0; k < dstSpan - 1; ++k) {
-        const int64_t offset = (static_cast<int64_t>(k) * srcSpan + dstSpan / 2) / dstSpan;
-        table[k] = static_cast<int32_t>(std::min<int64_t>(first + offset, limit));
-    }
-    table[dstSpan - 1] = last;
+    for (int32_t k = 0; k < dstSpan; ++k)
+        table[k] = RoundedIndex(k, first, srcSpan, dstSpan, pictureSpan);
     return table;
 }
 
@@ -47,25 +38,18 @@ bool CanTabulate(const IMG_PARAM& src, const IMG_PARAM& dst)
            dst.cy >= 1;
 }
 
-}  // namespace
-
-int DIB_ResizeNear(const IMG_PARAM& src, IMG_PARAM& dst)
+void Near(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
     WalkBottomUpWithEdges(
         src, dst,
         [](unsigned char* out, int32_t column, const SourceTap& tap) {
             CopyRgbaPixel(out, column, tap.upper, tap.left);
         },
         CopyRgbaPixel);
-    return 1;
 }
 
-int DIB_ResizeBiLiner(const IMG_PARAM& src, IMG_PARAM& dst)
+void BiLiner(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
     WalkBottomUpWithEdges(
         src, dst,
         [](unsigned char* out, int32_t column, const SourceTap& tap) {
@@ -80,13 +64,10 @@ int DIB_ResizeBiLiner(const IMG_PARAM& src, IMG_PARAM& dst)
             pixel[kColourBytes] = tap.upper[left + kColourBytes];
         },
         CopyRgbaPixel);
-    return 1;
 }
 
-int DIB_ResizeNear8(const IMG_PARAM& src, IMG_PARAM& dst)
+void Near8(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanTabulate(src, dst))
-        return 0;
     const std::vector<int32_t> columns = NearestIndexTable(src.x, src.cx, dst.cx, src.nWidth);
     const std::vector<int32_t> rows = NearestIndexTable(src.y, src.cy, dst.cy, src.nHeight);
     for (int32_t j = 0; j < dst.cy; ++j) {
@@ -95,13 +76,10 @@ int DIB_ResizeNear8(const IMG_PARAM& src, IMG_PARAM& dst)
         for (int32_t i = 0; i < dst.cx; ++i)
             out[i] = in[columns[i]];
     }
-    return 1;
 }
 
-int DIB_ResizeBiLiner8(const IMG_PARAM& src, IMG_PARAM& dst)
+void BiLiner8(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
     WalkBottomUpWithEdges(
         src, dst,
         [](unsigned char* out, int32_t column, const SourceTap& tap) {
@@ -109,5 +87,26 @@ int DIB_ResizeBiLiner8(const IMG_PARAM& src, IMG_PARAM& dst)
                                                             tap.lower[tap.left], tap.lower[tap.right], tap.wx, tap.wy));
         },
         CopyGreyPixel);
-    return 1;
+}
+
+}  // namespace
+
+int DIB_ResizeNear(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanStep(src, dst), Near, PlannedNear, src, dst);
+}
+
+int DIB_ResizeBiLiner(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanStep(src, dst), BiLiner, PlannedBiLiner, src, dst);
+}
+
+int DIB_ResizeNear8(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanTabulate(src, dst), Near8, PlannedNear8, src, dst);
+}
+
+int DIB_ResizeBiLiner8(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanStep(src, dst), BiLiner8, PlannedBiLiner8, src, dst);
 }

@@ -29,6 +29,13 @@ bool CanStep(const IMG_PARAM& src, const IMG_PARAM& dst);
 // Maps output 0 onto source 0 and output cx - 1 onto source cx - 1, truncating.
 FixedSteps StepsFor(const IMG_PARAM& src, const IMG_PARAM& dst);
 
+// Entry k of a nearest-index table of dstSpan entries over srcSpan source indices from first:
+// first + (k x srcSpan + dstSpan / 2) / dstSpan, rounding to the nearest source index; the last
+// entry is the source's last index. When enlarging, the rounding can land one index past the
+// source rectangle: that read stays, unless it would leave the picture (pictureSpan indices),
+// where the picture's last index is read instead.
+int32_t RoundedIndex(int32_t k, int32_t first, int32_t srcSpan, int32_t dstSpan, int32_t pictureSpan);
+
 // Positions are running sums of a step; 64 bits keep the sum one step past the end defined.
 inline int32_t WholePart(int64_t position) { return static_cast<int32_t>(position >> kFixedShift); }
 inline int32_t FractionPart(int64_t position) { return static_cast<int32_t>(position & kFixedFraction); }

@@ -2,6 +2,7 @@
 
 #include "image/resize/FixedPointWalk.h"
 #include "image/resize/PlaneRows.h"
+#include "image/resize/PlannedKernels.h"
 
 using namespace avpost::detail;
 
@@ -19,12 +20,8 @@ void BlendRows(const unsigned char* upper, const unsigned char* lower, int32_t w
     }
 }
 
-}  // namespace
-
-int DIB_ResizeNearY(const IMG_PARAM& src, IMG_PARAM& dst)
+void NearY(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
     const FixedSteps steps = StepsFor(src, dst);
     int64_t fy = 0;
     for (int32_t j = 0; j < dst.cy; ++j, fy += steps.y) {
@@ -32,13 +29,10 @@ int DIB_ResizeNearY(const IMG_PARAM& src, IMG_PARAM& dst)
         CopyNearestRow(TopDownRow(src, src.y + WholePart(fy)), src.x, steps.x, out + dst.x, dst.cx);
         PaintRowMargins(out, dst);
     }
-    return 1;
 }
 
-int DIB_ResizeBiLinerY(const IMG_PARAM& src, IMG_PARAM& dst)
+void BiLinerY(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    if (!CanStep(src, dst))
-        return 0;
     const FixedSteps steps = StepsFor(src, dst);
     const int32_t lastRow = LastRow(src);
     int64_t fy = 0;
@@ -52,5 +46,16 @@ int DIB_ResizeBiLinerY(const IMG_PARAM& src, IMG_PARAM& dst)
     unsigned char* out = TopDownRow(dst, dst.y + dst.cy - 1);
     CopyNearestRow(TopDownRow(src, lastRow), src.x, steps.x, out + dst.x, dst.cx);
     PaintRowMargins(out, dst);
-    return 1;
+}
+
+}  // namespace
+
+int DIB_ResizeNearY(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanStep(src, dst), NearY, PlannedNearY, src, dst);
+}
+
+int DIB_ResizeBiLinerY(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return RunFastest(CanStep(src, dst), BiLinerY, PlannedBiLinerY, src, dst);
 }

@@ -169,6 +169,45 @@ TEST(VideoFrameEffects, PassThroughUntilTheFirstOwnPictureAdjustedFilteredInBitO
     }
 }
 
+TEST(VideoFrameBlack, EveryPullDrawsOnBlackWhereThePictureIsNot)
+{
+    // Brightness lifts the black of the bars, so a bar not made black again before the next
+    // picture shows up lifted twice. A crop drawn with brightness gets black around it too.
+    const tagRECT noCrop = {0, 0, 0, 0}, crop = {3, 5, 60, 41};
+    const struct {
+        int width, height, aspX, aspY;
+        RESIZE_PARAM request;
+        tagRECT crop;
+        int reportedWidth;  // the stream information may not match the pictures
+    } cases[] = {
+        {64, 48, 4, 3, {112, 63, INTERPOLATION_BILINEAR, RESIZE_KEEP_ASPECT}, noCrop, 64},  // side bars
+        {33, 21, 16, 9, {41, 37, INTERPOLATION_NEAREST, RESIZE_KEEP_ASPECT}, noCrop, 33},   // odd corner
+        {64, 48, 0, 0, {40, 30, INTERPOLATION_BICUBIC, RESIZE_STRETCH}, noCrop, 64},        // nothing drawn
+        {64, 48, 0, 0, {1, 30, INTERPOLATION_BILINEAR, RESIZE_STRETCH}, noCrop, 64},        // refused: 1 wide
+        {64, 48, 0, 0, {50, 50, INTERPOLATION_BILINEAR, RESIZE_KEEP_ASPECT}, crop, 64},     // crop in bars
+        {64, 48, 0, 0, {80, 48, INTERPOLATION_BILINEAR, RESIZE_KEEP_ASPECT}, noCrop, 80},   // copy refused
+        {64, 48, 0, 0, {40, 30, INTERPOLATION_BILINEAR, RESIZE_STRETCH}, noCrop, 80},       // resize refused
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(&c - cases);
+        Painted source(c.width, c.height, c.aspX, c.aspY);
+        source.info().video.width = c.reportedWidth;
+        VideoProcess stage(&source, &c.request, kNoEvenStage, false);
+        if (c.crop.right != 0)
+            stage.SetCropRect(&c.crop);
+        stage.brightness = 30;
+        const MEDIA_FRAME* in = source.GetFrame();
+        FramePtr expected = NewFrame(stage.outputFormat->width, stage.outputFormat->height);
+        if (c.reportedWidth == c.width) {
+            IMG_PARAM dst = stage.dstParam;
+            ImageResizeYUV(stage.srcParam, in, dst, expected.get(), c.request.interpolation);
+        }
+        AdjustImage(expected.get(), 30, 0, 0);
+        for (int pull = 0; pull < 2; ++pull)
+            EXPECT_TRUE(SamePicture(stage.GetFrame(), expected.get())) << "pull " << pull;
+    }
+}
+
 TEST(VideoCrop, ClampingSquarePixelsAndRequestedSize)
 {
     const RESIZE_PARAM request = {640, 480, INTERPOLATION_BILINEAR, RESIZE_KEEP_ASPECT};

@@ -8,6 +8,8 @@
 
 #include "OutputTestFiles.h"
 #include "image/output/DibImage.h"
+#include "support/CpuFeatures.h"
+#include "support/SimdLevels.h"
 
 namespace {
 
@@ -60,6 +62,14 @@ TEST(JpegScan, FlatGreyPicturesCodeEachBlocksDcAndOneEndOfBlock)
     }
 }
 
+uint64_t Fnv1a(const Bytes& bytes)
+{
+    uint64_t hash = 14695981039346656037ull;
+    for (unsigned char b : bytes)
+        hash = (hash ^ b) * 1099511628211ull;
+    return hash;
+}
+
 // Pinned when the x86-64 and 32-bit builds agreed: the arithmetic, rounding included, must
 // give the same bytes on every build.
 TEST(JpegScan, EveryBuildWritesTheSameBytes)
@@ -67,15 +77,90 @@ TEST(JpegScan, EveryBuildWritesTheSameBytes)
     ScratchDir dir;
     DibImage noise;
     avpost_test::PaintNoise(noise, 45, 29, 11);
-    const Bytes jpeg = EncodeJpeg(noise, dir);
-    uint64_t hash = 14695981039346656037ull;  // FNV-1a
-    for (unsigned char b : jpeg)
-        hash = (hash ^ b) * 1099511628211ull;
-    EXPECT_EQ(hash, 2173301848693968694ull);
+    EXPECT_EQ(Fnv1a(EncodeJpeg(noise, dir)), 2173301848693968694ull);
 }
 
-// Other depths, a damaged header, missing rows, a size with no rows behind it, and names
-// longer than 511 bytes.
+// Pictures that reach every path of the coder: noise (large values, stuffed FF bytes), smooth
+// gradients (padding by repetition), one-pixel checks, saturated colours (the ends of the chroma
+// range) and single DCT basis functions, one frequency per block and channel (zero runs of every
+// length, 16 and more included, up to the last zigzag position).
+enum class Content { kNoise, kGradient, kChecks, kSaturated, kBasis };
+
+// cos(m pi / 16) x 1000, in integers so that every build paints the same picture.
+int Cosine(int m)
+{
+    constexpr int kQuarter[9] = {1000, 981, 924, 831, 707, 556, 383, 195, 0};
+    m %= 32;
+    if (m > 16)
+        m = 32 - m;
+    return m <= 8 ? kQuarter[m] : -kQuarter[16 - m];
+}
+
+int BasisSample(int x, int y, int channel)
+{
+    const int frequency = 1 + ((x / 8) * 5 + (y / 8) * 11 + channel * 21) % 63;
+    const int wave = Cosine((2 * (x % 8) + 1) * (frequency % 8)) * Cosine((2 * (y % 8) + 1) * (frequency / 8));
+    return 128 + 110 * wave / 1000000;
+}
+
+void PaintContent(DibImage& image, int width, int height, Content content)
+{
+    switch (content) {
+    case Content::kNoise:
+        return avpost_test::PaintNoise(image, width, height, static_cast<uint32_t>(width * 131 + height));
+    case Content::kGradient:
+        return avpost_test::PaintGradient(image, width, height);
+    case Content::kChecks:
+        return avpost_test::Paint(image, width, height, [](int x, int y, int c) { return (x + y + c) % 2 * 255; });
+    case Content::kBasis:
+        return avpost_test::Paint(image, width, height, BasisSample);
+    case Content::kSaturated:
+        // Yellow, cyan, blue, red ... in one-pixel-wide diagonal bands of the eight corners of the RGB cube.
+        return avpost_test::Paint(image, width, height,
+                                  [](int x, int y, int c) { return ((x + 2 * y) / 3 % 8 >> c & 1) * 255; });
+    }
+}
+
+// Pinned from the encoder as first written, agreed by the x86-64, 32-bit and sanitizer builds:
+// whole blocks, odd sizes, single rows and columns; the same bytes at every instruction-set level.
+TEST(JpegScan, PinnedFilesAcrossSizes)
+{
+    const struct {
+        int width, height;
+        Content content;
+        uint64_t hash;
+    } cases[] = {
+        {1, 1, Content::kNoise, 4202928657668981349ull},
+        {8, 8, Content::kNoise, 2096077637085012109ull},
+        {9, 7, Content::kNoise, 2546781633652468741ull},
+        {64, 48, Content::kNoise, 4746689434414567178ull},
+        {67, 33, Content::kNoise, 17353925480773855651ull},
+        {1, 37, Content::kNoise, 8583439818104409794ull},
+        {203, 1, Content::kNoise, 5750935098234129895ull},
+        {16, 16, Content::kGradient, 7062311530282425889ull},
+        {161, 95, Content::kGradient, 4027701855513303729ull},
+        {320, 240, Content::kGradient, 4124311777100302406ull},
+        {8, 8, Content::kChecks, 15888048445037434470ull},
+        {77, 41, Content::kChecks, 15492450617705220120ull},
+        {24, 24, Content::kSaturated, 14861674594231001901ull},
+        {99, 51, Content::kSaturated, 1968099523827378989ull},
+        {64, 64, Content::kBasis, 6607009278063751447ull},
+        {203, 99, Content::kBasis, 15099398329717187023ull},
+    };
+    ScratchDir dir;
+    for (avpost::simd::Level level : AvailableSimdLevels()) {
+        avpost::simd::ScopedLevel pin(level);
+        for (const auto& c : cases) {
+            DibImage image;
+            PaintContent(image, c.width, c.height, c.content);
+            EXPECT_EQ(Fnv1a(EncodeJpeg(image, dir)), c.hash) << avpost::simd::NameOf(level) << ", " << c.width << "x"
+                                                              << c.height << " content " << static_cast<int>(c.content);
+        }
+    }
+}
+
+// Other depths, a damaged header, missing rows, a size with no rows behind it, names longer
+// than 511 bytes, and JPEG files that cannot be created or written.
 TEST(JpegRefusals, WhatItCannotUseWritesNothing)
 {
     ScratchDir dir;
@@ -106,6 +191,9 @@ TEST(JpegRefusals, WhatItCannotUseWritesNothing)
     EXPECT_EQ(BMP2JPEG(good.c_str(), longest.c_str()), 0);
     EXPECT_TRUE(std::filesystem::exists(longest));
     EXPECT_EQ(BMP2JPEG(good.c_str(), dir.File("missing/out.jpg").c_str()), EOF);
+    // A device that takes nothing: the failed write is reported, and the device left alone.
+    EXPECT_EQ(BMP2JPEG(good.c_str(), "/dev/full"), EOF);
+    EXPECT_TRUE(std::filesystem::exists("/dev/full"));
 }
 
 // Pictures large enough for the conversions to overlap.

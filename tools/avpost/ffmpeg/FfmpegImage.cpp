@@ -15,7 +15,7 @@ Bitmap32 LoadImageWithFfmpeg(const std::string& path)
     FfmpegStream stream(path, AVMEDIA_TYPE_VIDEO);
     const AVFrame* frame = stream.NextFrame();
     if (frame == nullptr)
-        Fail(path, "holds no picture");
+        Fail(path, "holds no picture avpost can read");
     if (frame->width > kLargestPictureSide || frame->height > kLargestPictureSide)
         Fail(path, "picture is too large for a watermark");
     SwsContext* scaler =

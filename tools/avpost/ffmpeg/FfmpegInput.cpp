@@ -1,5 +1,6 @@
 #include "tools/avpost/ffmpeg/FfmpegInput.h"
 
+#include <cerrno>
 #include <new>
 
 #include "tools/avpost/common/Interruption.h"
@@ -10,6 +11,16 @@ namespace avpost::tool {
 namespace {
 
 constexpr AVRational kUnits{1, 10000000};
+
+// Errors that say something about the file itself rather than its contents; the rest (invalid
+// data, or the demuxer the file's name suggests refusing it) mean FFmpeg found no media in it.
+bool IsFileError(int code)
+{
+    for (int error : {ENOENT, EACCES, EISDIR, EIO, ENOMEM, EMFILE})
+        if (code == AVERROR(error))
+            return true;
+    return false;
+}
 
 const char* TypeName(AVMediaType type)
 {
@@ -35,7 +46,7 @@ FfmpegInput::FfmpegInput(const std::string& path) : name_(path == "-" ? "standar
     format->interrupt_callback.callback = [](void*) { return PendingInterruption() != 0 ? 1 : 0; };
     int code = avformat_open_input(&format, path == "-" ? "pipe:0" : path.c_str(), nullptr, nullptr);
     if (code < 0)
-        Fail(name_, code == AVERROR_INVALIDDATA ? "not a media file that avpost can read" : FfmpegErrorText(code));
+        Fail(name_, IsFileError(code) ? FfmpegErrorText(code) : "not a media file that avpost can read");
     format_.reset(format);
     if ((code = avformat_find_stream_info(format, nullptr)) < 0)
         FailWith("cannot read the stream layout", code);

@@ -28,6 +28,38 @@ bool AllTransparent(const Bitmap32& bitmap)
     return true;
 }
 
+// Where the file's size is known, the pixels the header announces must lie inside it: a lying
+// header is refused before anything is allocated for it.
+void CheckPixelsFit(const ByteSource& file, uint32_t dataOffset, size_t pixelBytes)
+{
+    const long long size = file.size();
+    if (size <= 0)
+        return;  // a pipe: the rows tell as they arrive
+    if (dataOffset > size)
+        Fail(file.name(), "BMP pixel data offset " + std::to_string(dataOffset) + " lies beyond the end of the " +
+                              std::to_string(size) + "-byte file");
+    if (pixelBytes > static_cast<unsigned long long>(size - dataOffset))
+        Fail(file.name(), "truncated BMP pixel data (the header announces " + std::to_string(pixelBytes) +
+                              " bytes, the file holds " + std::to_string(size - dataOffset) + ")");
+}
+
+// Skips what lies between the headers and the pixels (masks, colour profile) without holding it.
+void SkipTo(ByteSource& file, uint32_t dataOffset)
+{
+    long long left = static_cast<long long>(dataOffset) - static_cast<long long>(kFileHeaderBytes + kInfoHeaderBytes);
+    if (file.seekable()) {
+        file.SeekTo(file.Tell() + left);
+        return;
+    }
+    unsigned char scrap[4096];
+    while (left > 0) {
+        const size_t piece = left < static_cast<long long>(sizeof(scrap)) ? static_cast<size_t>(left) : sizeof(scrap);
+        if (!file.ReadExactly(scrap, piece, "BMP header"))
+            Fail(file.name(), "BMP pixel data offset lies beyond the end of the input");
+        left -= static_cast<long long>(piece);
+    }
+}
+
 void MakeOpaque(Bitmap32& bitmap)
 {
     for (size_t i = 3; i < bitmap.pixels.size(); i += 4)
@@ -53,6 +85,8 @@ Bitmap32 ReadBmp(ByteSource& file)
     const std::string& path = file.name();
     unsigned char header[kFileHeaderBytes + kInfoHeaderBytes];
     const size_t got = file.Read(header, sizeof(header));
+    if (got == 0)
+        Fail(path, "empty file");
     if (got < 2 || std::memcmp(header, "BM", 2) != 0)
         Fail(path, "not a BMP file");
     if (got < sizeof(header))
@@ -62,20 +96,22 @@ Bitmap32 ReadBmp(ByteSource& file)
     const auto rawHeight = static_cast<int32_t>(Le32(header + 22));
     const unsigned bits = header[28] | header[29] << 8;
     const uint32_t compression = Le32(header + 30);
-    const int height = rawHeight < 0 ? -rawHeight : rawHeight;
-    if (width <= 0 || height <= 0 || width > kLargestPictureSide || height > kLargestPictureSide)
+    // Negative heights mark top-down rows; the most negative one has no positive counterpart.
+    const int64_t rows = rawHeight < 0 ? -int64_t{rawHeight} : rawHeight;
+    if (width <= 0 || rows <= 0 || width > kLargestPictureSide || rows > kLargestPictureSide)
         Fail(path, "BMP has an unusable size");
+    const int height = static_cast<int>(rows);
     if (bits != 24 && bits != 32)
         Fail(path, "unsupported BMP: " + std::to_string(bits) + " bits per pixel (24 and 32 are read)");
     if (compression != kUncompressed && !(compression == kBitFields && bits == 32))
         Fail(path, "unsupported BMP: compressed pixels (only uncompressed BMP is read)");
 
-    // Skip whatever lies between the headers and the pixels (masks, colour profile).
-    std::vector<unsigned char> scrap(dataOffset > sizeof(header) ? dataOffset - sizeof(header) : 0);
-    if (dataOffset < sizeof(header) || !file.ReadExactly(scrap.data(), scrap.size(), "BMP header"))
-        Fail(path, "BMP pixel data offset is invalid");
-
     const size_t stride = (static_cast<size_t>(width) * bits / 8 + 3) & ~size_t{3};
+    if (dataOffset < sizeof(header))
+        Fail(path, "BMP pixel data offset is invalid");
+    CheckPixelsFit(file, dataOffset, stride * static_cast<size_t>(height));
+    SkipTo(file, dataOffset);
+
     std::vector<unsigned char> row(stride);
     Bitmap32 bitmap(width, height);
     for (int r = 0; r < height; ++r) {

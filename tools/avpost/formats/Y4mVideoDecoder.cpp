@@ -24,9 +24,26 @@ void Y4mVideoDecoder::OpenFile(const std::string& path)
     FillVideoInfo(info_, format.width, format.height, rate_.value(),
                   DisplayAspect(format.width, format.height, format.pixelAspect));
     traits_ = PictureTraits{format.interlace, format.chroma, 0};
+    CheckFirstPictureFits();
     picture_.reset(CreateYV12Frame(format.width, format.height, false, true));
     if (!ReadNext())
         Fail(input_->name(), "Y4M stream holds no pictures");
+}
+
+// A file must hold the first picture its header announces before a picture of that size is
+// allocated; a pipe cannot tell its length, so there the first read finds out.
+void Y4mVideoDecoder::CheckFirstPictureFits() const
+{
+    if (!input_->seekable())
+        return;
+    const long long left = input_->size() - reader_->position();
+    const size_t needed = reader_->format().PictureBytes() + kFrameLineBytes;
+    if (left <= 0)
+        Fail(input_->name(), "Y4M stream holds no pictures");
+    if (static_cast<unsigned long long>(left) < needed)
+        Fail(input_->name(), "truncated: the header announces " + std::to_string(reader_->format().width) + "x" +
+                                 std::to_string(reader_->format().height) + " pictures of " +
+                                 std::to_string(needed) + " bytes, " + std::to_string(left) + " bytes follow it");
 }
 
 double Y4mVideoDecoder::TotalSeconds() const

@@ -26,6 +26,7 @@ public:
     int Forward(int count) override;
 
 private:
+    void CheckFirstPictureFits() const;
     bool ReadNext();
     void StampCurrent();
     double TimeOf(long long index) const;

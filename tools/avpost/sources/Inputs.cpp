@@ -57,6 +57,11 @@ std::unique_ptr<Decoder> Opened(const std::string& path)
 template <typename Base, typename Own, typename Ffmpeg>
 std::unique_ptr<Base> OpenInput(const std::string& path, bool looksOwn, const char* format)
 {
+    if (!IsStandardStream(path)) {
+        const InputFile probe(path);
+        if (probe.seekable() && probe.size() == 0)
+            Fail(path, "empty file");
+    }
     if (IsStandardStream(path) || looksOwn) {
         try {
             return Opened<Own>(path);
@@ -98,7 +103,10 @@ std::string InputName(const std::string& path)
 
 Bitmap32 LoadWatermarkImage(const std::string& path)
 {
-    if (Head(path, 2) == "BM") {
+    const std::string head = Head(path, 2);
+    if (head.empty())
+        Fail(path, "empty file");
+    if (head == "BM") {
         InputFile file(path);
         return ReadBmp(file);
     }
