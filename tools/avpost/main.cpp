@@ -57,6 +57,9 @@ int Execute(const avpost::tool::Invocation& call)
     case Command::Audio:
         avpost::tool::RunAudioCommand(call);
         return 0;
+    case Command::Convert:
+        avpost::tool::RunConvertCommand(call);
+        return 0;
     }
     return kFailed;
 }

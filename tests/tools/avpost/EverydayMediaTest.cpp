@@ -99,16 +99,7 @@ class EverydayMedia : public testing::MediaSuite {
 protected:
     static void SetUpTestSuite() { StartMedia(); }
 
-    // An input, made on first use (each test runs in a process of its own and needs few).
-    static std::string Input(const std::string& name)
-    {
-        if (!std::filesystem::exists(Media(name))) {
-            std::vector<std::string> recipe = Recipe(name);
-            recipe.push_back(Media(name));
-            Make(recipe);
-        }
-        return Media(name);
-    }
+    static std::string Input(const std::string& name) { return MadeOnce(name, Recipe); }
 
     static std::vector<std::string> Recipe(const std::string& name)
     {
@@ -336,57 +327,6 @@ TEST_F(EverydayMedia, OutputsTellTheInputsFieldsAndChromaUnlessDeinterlaced)
     }
 }
 
-// avpost reading standard input from a pipe that the test feeds, so that the run is still
-// going when the test sends its signal.
-class FedRun {
-public:
-    explicit FedRun(const std::vector<std::string>& arguments)
-    {
-        int fds[2];
-        EXPECT_EQ(pipe(fds), 0);
-        child_ = fork();
-        if (child_ == 0) {
-            dup2(fds[0], 0);
-            close(fds[1]);
-            dup2(open("/dev/null", O_WRONLY), 2);
-            testing::Become(arguments);
-        }
-        close(fds[0]);
-        feed_ = fds[1];
-    }
-    ~FedRun() { close(feed_); }
-    FedRun(const FedRun&) = delete;
-    FedRun& operator=(const FedRun&) = delete;
-
-    void Feed(const std::string& bytes) { EXPECT_EQ(write(feed_, bytes.data(), bytes.size()), ssize_t(bytes.size())); }
-    // Sends the signal until the run ends (one that comes between two reads is noticed at the
-    // next; the next signal interrupts that read), and returns the exit status.
-    int Interrupt(int signal)
-    {
-        int status = 0;
-        for (int tries = 0; tries < 50 && waitpid(child_, &status, WNOHANG) == 0; ++tries) {
-            kill(child_, signal);
-            std::this_thread::sleep_for(std::chrono::milliseconds(100));
-        }
-        return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-    }
-
-private:
-    pid_t child_ = -1;
-    int feed_ = -1;
-};
-
-// Waits until a file other than those named appears in the folder (the staged output).
-bool SomethingAppears(const testing::TempDir& dir, size_t already)
-{
-    for (int i = 0; i < 500; ++i) {
-        if (dir.List().size() > already)
-            return true;
-        std::this_thread::sleep_for(std::chrono::milliseconds(10));
-    }
-    return false;
-}
-
 TEST_F(EverydayMedia, AnInterruptedRunLeavesNothingBehindAndSaysWhichSignal)
 {
     const std::string clip = ReadWholeFile(Input("clip.y4m"));
@@ -401,9 +341,9 @@ TEST_F(EverydayMedia, AnInterruptedRunLeavesNothingBehindAndSaysWhichSignal)
         std::vector<std::string> arguments{AVPOST_TOOL_PATH, c.command, "-", out_.File(video ? "out.y4m" : "out.wav")};
         if (video)
             arguments.insert(arguments.end(), {"--capture", "0=" + out_.File("shot.bmp")});
-        FedRun run(arguments);
+        testing::FedRun run(arguments);
         run.Feed(c.input->substr(0, c.input->size() / 2));  // the run waits for the rest
-        ASSERT_TRUE(SomethingAppears(out_, 0)) << c.signal;
+        ASSERT_TRUE(testing::SomethingAppears(out_, 0)) << c.signal;
         EXPECT_EQ(run.Interrupt(c.signal), 128 + c.signal);
         EXPECT_EQ(out_.List(), std::vector<std::string>{}) << c.signal;
     }

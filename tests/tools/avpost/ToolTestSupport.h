@@ -8,6 +8,8 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <chrono>
+#include <csignal>
 #include <cstdint>
 #include <cstdlib>
 #include <filesystem>
@@ -16,6 +18,7 @@
 #include <sstream>
 #include <stdexcept>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "tools/avpost/common/ToolError.h"
@@ -105,6 +108,57 @@ inline RunResult RunProgram(const std::vector<std::string>& command, const std::
     return result;
 }
 
+// avpost reading standard input from a pipe that the test feeds, so that the run is still
+// going when the test sends its signal.
+class FedRun {
+public:
+    explicit FedRun(const std::vector<std::string>& arguments)
+    {
+        int fds[2];
+        EXPECT_EQ(pipe(fds), 0);
+        child_ = fork();
+        if (child_ == 0) {
+            dup2(fds[0], 0);
+            close(fds[1]);
+            dup2(open("/dev/null", O_WRONLY), 2);
+            Become(arguments);
+        }
+        close(fds[0]);
+        feed_ = fds[1];
+    }
+    ~FedRun() { close(feed_); }
+    FedRun(const FedRun&) = delete;
+    FedRun& operator=(const FedRun&) = delete;
+
+    void Feed(const std::string& bytes) { EXPECT_EQ(write(feed_, bytes.data(), bytes.size()), ssize_t(bytes.size())); }
+    // Sends the signal until the run ends (one that comes between two reads is noticed at the
+    // next; the next signal interrupts that read), and returns the exit status.
+    int Interrupt(int signal)
+    {
+        int status = 0;
+        for (int tries = 0; tries < 50 && waitpid(child_, &status, WNOHANG) == 0; ++tries) {
+            kill(child_, signal);
+            std::this_thread::sleep_for(std::chrono::milliseconds(100));
+        }
+        return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+    }
+
+private:
+    pid_t child_ = -1;
+    int feed_ = -1;
+};
+
+// Waits until a file other than those named appears in the folder (the staged output).
+inline bool SomethingAppears(const TempDir& dir, size_t already)
+{
+    for (int i = 0; i < 500; ++i) {
+        if (dir.List().size() > already)
+            return true;
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+    }
+    return false;
+}
+
 // Values from ffprobe about a file's first stream of a type ("v" or "a"), such as
 // "width,nb_read_frames", comma-separated in ffprobe's own order (codec_name, width, height,
 // pix_fmt, r_frame_rate, nb_read_frames; sample_rate, channels, duration); empty when ffprobe
@@ -114,6 +168,22 @@ inline std::string Probe(const std::string& path, const std::string& streamType,
     const RunResult run = RunProgram({"ffprobe", "-v", "error", "-count_frames", "-select_streams", streamType + ":0",
                                       "-show_entries", "stream=" + entries, "-of", "csv=p=0", path});
     return run.exitCode == 0 ? run.out.substr(0, run.out.find('\n')) : "";
+}
+
+// A value from ffprobe about a file's container, such as "duration"; empty when it cannot tell.
+inline std::string ProbeFormat(const std::string& path, const std::string& entry)
+{
+    const RunResult run = RunProgram({"ffprobe", "-v", "error", "-show_entries", "format=" + entry, "-of", "csv=p=0", path});
+    return run.exitCode == 0 ? run.out.substr(0, run.out.find('\n')) : "";
+}
+
+// Words joined by spaces, for messages about a command line.
+inline std::string JoinedWords(const std::vector<std::string>& words)
+{
+    std::string text;
+    for (const std::string& word : words)
+        text += (text.empty() ? "" : " ") + word;
+    return text;
 }
 
 inline double ProbeSeconds(const std::string& path, const std::string& streamType)
@@ -173,6 +243,18 @@ protected:
     }
 
     static std::string Media(const std::string& name) { return media_->File(name); }
+    // A media file made on first use (each test runs in a process of its own and needs few):
+    // ffmpeg's arguments for it come from recipe(name), without the file.
+    template <typename Recipe>
+    static std::string MadeOnce(const std::string& name, Recipe recipe)
+    {
+        if (!std::filesystem::exists(Media(name))) {
+            std::vector<std::string> arguments = recipe(name);
+            arguments.push_back(Media(name));
+            Make(arguments);
+        }
+        return Media(name);
+    }
     // Runs ffmpeg quietly with these arguments, the last being the file it makes.
     static void Make(std::vector<std::string> arguments)
     {

@@ -15,15 +15,37 @@ int ChoiceValue(const std::vector<Choice>& choices, const std::string& text, con
     throw Expected{what};
 }
 
+std::string RangeText(const OptionSpec& spec)
+{
+    return "a whole number from " + std::to_string(spec.low) + " to " + std::to_string(spec.high);
+}
+
+// Items of a timed kind: plain ones make the value outside every stretch (numbers: the last
+// one; choices: all of them), VALUE@FROM-UNTIL ones a stretch each.
+void ReadTimedItems(const OptionSpec& spec, const std::string& text, OptionValue& value)
+{
+    const bool whole = spec.kind == ValueKind::TimedWhole;
+    const std::string what = (whole ? RangeText(spec) : "a comma-separated list of " + ChoiceNames(spec.choices)) +
+                             ", each may be limited to a time as VALUE@FROM-UNTIL";
+    for (const std::string& item : Split(text, ',')) {
+        const size_t at = item.find('@');
+        const std::string name = item.substr(0, at);
+        const int number =
+            whole ? WholeNumber(name, spec.low, spec.high, what) : ChoiceValue(spec.choices, name, what);
+        if (at != std::string::npos)
+            value.stretches.push_back({number, ParseTimeRange(item.substr(at + 1))});
+        else
+            value.number = whole ? number : value.number | number;
+    }
+}
+
 OptionValue ValueOf(const OptionSpec& spec, const std::string& text)
 {
     OptionValue value;
     value.text = text;
     switch (spec.kind) {
     case ValueKind::Whole:
-        value.number = WholeNumber(text, spec.low, spec.high,
-                                   "a whole number from " + std::to_string(spec.low) + " to " +
-                                       std::to_string(spec.high));
+        value.number = WholeNumber(text, spec.low, spec.high, RangeText(spec));
         break;
     case ValueKind::Choice:
         value.number = ChoiceValue(spec.choices, text, ChoiceNames(spec.choices));
@@ -31,6 +53,10 @@ OptionValue ValueOf(const OptionSpec& spec, const std::string& text)
     case ValueKind::ChoiceList:
         for (const std::string& name : Split(text, ','))
             value.number |= ChoiceValue(spec.choices, name, "a comma-separated list of " + ChoiceNames(spec.choices));
+        break;
+    case ValueKind::TimedWhole:
+    case ValueKind::TimedChoiceList:
+        ReadTimedItems(spec, text, value);
         break;
     case ValueKind::Switch:
     case ValueKind::Text:
@@ -58,16 +84,19 @@ void ApplyDefaults(Invocation& call)
 
 const char* CommandName(unsigned bit)
 {
-    return bit == kForDemo ? "demo" : bit == kForVideo ? "video" : "audio";
+    return bit == kForDemo ? "demo" : bit == kForVideo ? "video" : bit == kForAudio ? "audio" : "convert";
 }
 
 std::string CommandsOf(const OptionSpec& spec)
 {
-    std::string names;
-    for (unsigned bit : {kForDemo, kForVideo, kForAudio})
+    std::vector<std::string> names;
+    for (unsigned bit : {kForDemo, kForVideo, kForAudio, kForConvert})
         if ((spec.commands & bit) != 0)
-            names += std::string(names.empty() ? "" : " and ") + "'avpost " + CommandName(bit) + "'";
-    return names;
+            names.push_back("'avpost " + std::string(CommandName(bit)) + "'");
+    std::string text;
+    for (size_t i = 0; i < names.size(); ++i)
+        text += (i == 0 ? "" : i + 1 == names.size() ? " and " : ", ") + names[i];
+    return text;
 }
 
 bool IsOption(const std::string& argument)
@@ -83,11 +112,13 @@ Command CommandNamed(const std::string& word)
         return Command::Video;
     if (word == "audio")
         return Command::Audio;
+    if (word == "convert")
+        return Command::Convert;
     if (word == "help" || word == "--help" || word == "-h")
         return Command::Help;
     if (word == "--version")
         return Command::Version;
-    Fail(word, "unknown command (use demo, video or audio; see avpost --help)");
+    Fail(word, "unknown command (use convert, video, audio or demo; see avpost --help)");
 }
 
 // Applies the option at args[at]; returns how many arguments it used.
@@ -144,7 +175,7 @@ void Place(Invocation& call, std::vector<std::string>& positional)
         return;
     }
     if (positional.size() < wanted)
-        Fail(call.command == Command::Video ? "avpost video" : "avpost audio",
+        Fail(std::string("avpost ") + CommandName(CommandBit(call.command)),
              positional.empty() ? "needs an INPUT and an OUTPUT" : "needs an OUTPUT after the INPUT");
     call.input = positional[0];
     call.output = positional[1];

@@ -11,17 +11,19 @@ constexpr size_t kTextColumn = 26;
 const char kOverview[] = R"(avpost: audio and video post-processing through the avpost library stages
 
 Usage:
-  avpost demo [FOLDER]                 run the stages on a built-in test source
-  avpost video INPUT OUTPUT [options]  process the pictures of a file into Y4M
-  avpost audio INPUT OUTPUT [options]  process the sound of a file into WAV
-  avpost help [demo|video|audio]       this text, or one command's part of it
+  avpost convert INPUT OUTPUT [options]  process the pictures and sound of a
+                                         file into one encoded, playable file
+  avpost video INPUT OUTPUT [options]    process the pictures of a file into Y4M
+  avpost audio INPUT OUTPUT [options]    process the sound of a file into WAV
+  avpost demo [FOLDER]                   run the stages on built-in test media
+  avpost help [convert|video|audio|demo] this text, or one command's part
 
 INPUT is a Y4M (4:2:0) or 16-bit PCM WAV file, or any media file that FFmpeg's
 libraries read (mp4, mkv, mov, ...) when avpost was built with them. OUTPUT is a
-.y4m (video) or .wav (audio) file, or a device such as /dev/null; "-" reads
-standard input (Y4M or WAV) or writes standard output, to pipe into an encoder.
-An output appears only when it is complete: a failed or interrupted run leaves
-no half-written file and keeps an existing one.
+file, or a device such as /dev/null; "-" reads standard input or writes standard
+output, to pipe into another program (video and audio read Y4M or WAV from it,
+convert anything FFmpeg reads). An output appears only when it is complete: a
+failed or interrupted run leaves no half-written file and keeps an existing one.
 
 @GENERAL@
 Exit status: 0 done, 1 failed (one line on standard error says why), 2 the
@@ -51,6 +53,21 @@ avpost audio INPUT OUTPUT.wav [options]
   Writes 16-bit PCM; more than two channels carry their speaker layout.
 )";
 
+const char kConvertIntro[] = R"(
+avpost convert INPUT OUTPUT [options]
+  Takes the first video and the first audio stream of INPUT, runs the pictures
+  through the video stage at a constant rate and the sound through the audio
+  stage (gapless unless --gaps close), and encodes both into OUTPUT through
+  FFmpeg's libraries: H.264 (libx264) and AAC where the container holds them.
+  Sound and pictures start together; the shorter is made as long as the other
+  (the last picture repeated, silence added). The container follows OUTPUT's
+  ending or --format; mp4 and mov files are written with their index first, so
+  that they play while they download. Every option of avpost video and avpost
+  audio works here too. Reading, each stage and each encoder run on threads of
+  their own; the encoders' settings are checked before anything is written.
+  Needs an avpost built with FFmpeg.
+)";
+
 const std::vector<HelpExample> kDemoExamples = {
     {"demo /tmp/avpost-demo", "&& ffplay /tmp/avpost-demo/demo.y4m"}};
 const std::vector<HelpExample> kVideoExamples = {
@@ -61,6 +78,12 @@ const std::vector<HelpExample> kVideoExamples = {
      "--capture 0:01:02.5=still.jpg",
      ""},
     {"video in.y4m out.y4m --crop 640:360:40:60 --contrast 20 --filter emboss,sepia", ""}};
+const std::vector<HelpExample> kConvertExamples = {
+    {"convert talk.mov talk.mp4 --size 1280x720 --fps 25 --deinterlace even-average --volume 80", ""},
+    {"convert tape.ts - --format matroska", "| ffmpeg -i - -c copy tape.mkv"},
+    {"convert film.mkv trailer.mp4 --start 1:30 --duration 20 --filter sepia@3-4 --crf 20 --preset veryfast", ""},
+    {"convert lecture.mp4 lecture.webm --size 640x360 --thumbnails 60=slide%03d.jpg --json run.json", ""},
+    {"convert phone.mp4 sound.m4a --no-video --audio-bitrate 96k", ""}};
 const std::vector<HelpExample> kAudioExamples = {
     {"audio talk.mp4 talk.wav --rate 44100 --channels 2 --continuous", ""},
     {"audio movie.mkv movie.wav --channels 2", ""},
@@ -93,9 +116,9 @@ void AppendWrapped(std::string& text, const std::string& words, size_t indent)
 std::string Bounds(const OptionSpec& spec)
 {
     std::string bounds;
-    if (spec.kind == ValueKind::Whole)
+    if (spec.kind == ValueKind::Whole || spec.kind == ValueKind::TimedWhole)
         bounds = std::to_string(spec.low) + " ... " + std::to_string(spec.high);
-    else if (spec.kind == ValueKind::Choice)
+    else if (spec.kind == ValueKind::Choice || spec.kind == ValueKind::TimedChoiceList)
         bounds = ChoiceNames(spec.choices);
     if (spec.defaultValue != nullptr)
         bounds += (bounds.empty() ? "" : "; ") + std::string("default ") + spec.defaultValue;
@@ -117,7 +140,7 @@ std::string OptionLine(const OptionSpec& spec, const std::string& indent)
 
 bool IsGeneral(const OptionSpec& spec)
 {
-    return spec.commands == (kForDemo | kForVideo | kForAudio);
+    return spec.commands == (kForDemo | kForVideo | kForAudio | kForConvert);
 }
 
 // The options of a command, under their headings; the general ones are listed once, in the
@@ -153,7 +176,7 @@ std::string ExampleList(const std::vector<HelpExample>& examples)
 {
     std::string text = "  Examples:\n";
     for (const HelpExample& example : examples) {
-        std::string line = "    avpost ";
+        std::string line = "    avpost";  // the wrapping puts the space
         AppendWrapped(line, std::string(example.arguments) + (*example.then ? " " : "") + example.then, 8);
         text += line + "\n";
     }
@@ -166,23 +189,31 @@ std::string CommandHelp(const std::string& topic)
         return std::string(kDemoIntro) + ExampleList(kDemoExamples);
     if (topic == "video")
         return std::string(kVideoIntro) + OptionList(kForVideo) + ExampleList(kVideoExamples);
+    if (topic == "convert")
+        return std::string(kConvertIntro) + OptionList(kForConvert) + ExampleList(kConvertExamples);
     return std::string(kAudioIntro) + OptionList(kForAudio) + ExampleList(kAudioExamples);
+}
+
+bool IsTopic(const std::string& topic)
+{
+    return topic == "demo" || topic == "video" || topic == "audio" || topic == "convert";
 }
 
 }  // namespace
 
 std::string HelpText(const std::string& topic)
 {
-    if (topic == "demo" || topic == "video" || topic == "audio")
+    if (IsTopic(topic))
         return CommandHelp(topic).substr(1);
-    return Overview() + CommandHelp("demo") + CommandHelp("video") + CommandHelp("audio");
+    return Overview() + CommandHelp("convert") + CommandHelp("video") + CommandHelp("audio") + CommandHelp("demo");
 }
 
 std::string ShortUsage()
 {
-    return "usage: avpost demo [FOLDER]\n"
+    return "usage: avpost convert INPUT OUTPUT [options]\n"
            "       avpost video INPUT OUTPUT.y4m [options]\n"
            "       avpost audio INPUT OUTPUT.wav [options]\n"
+           "       avpost demo [FOLDER]\n"
            "       avpost --help   (every option, with examples)\n";
 }
 
@@ -193,6 +224,8 @@ std::string VersionText()
 
 const std::vector<HelpExample>& HelpExamples(const std::string& command)
 {
+    if (command == "convert")
+        return kConvertExamples;
     return command == "demo" ? kDemoExamples : command == "video" ? kVideoExamples : kAudioExamples;
 }
 

@@ -15,6 +15,7 @@ namespace avpost::tool {
 constexpr unsigned kForDemo = 1;
 constexpr unsigned kForVideo = 2;
 constexpr unsigned kForAudio = 4;
+constexpr unsigned kForConvert = 8;
 
 enum class ValueKind {
     Switch,      // no value
@@ -22,6 +23,10 @@ enum class ValueKind {
     Choice,      // one name of choices
     ChoiceList,  // names of choices separated by commas; their values are or-ed
     Text,        // a form of its own, parsed by the option's apply
+    // Timed forms: items separated by commas, each a value (a whole number in [low, high], or
+    // a name of choices) that may be limited to a stretch of time as VALUE@FROM-UNTIL.
+    TimedWhole,
+    TimedChoiceList,
 };
 
 struct Choice {
@@ -29,11 +34,15 @@ struct Choice {
     int value;
 };
 
-// A value as the table's kinds deliver it: the number of a Whole, Choice or ChoiceList, and
-// always the text as given.
+// A value as the table's kinds deliver it: the number of a Whole, Choice or ChoiceList (of
+// a timed kind: the value outside every stretch), the stretches of a timed kind, and always
+// the text as given.
 struct OptionValue {
     int number = 0;
+    std::vector<TimedValue> stretches;
     std::string text;
+
+    Timed timed() const { return {number, stretches}; }
 };
 
 struct OptionSpec {

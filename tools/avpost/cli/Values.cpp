@@ -33,6 +33,36 @@ std::string LowerCase(std::string text)
     return text;
 }
 
+// The ending of a file name that says BMP or JPEG; false for other endings.
+bool IsJpegName(const std::string& path, const std::string& what)
+{
+    const size_t dot = path.find_last_of('.');
+    const std::string extension = dot == std::string::npos ? "" : LowerCase(path.substr(dot));
+    Expect(extension == ".bmp" || extension == ".jpg" || extension == ".jpeg", what);
+    return extension != ".bmp";
+}
+
+// True when pattern holds exactly one number conversion (%d, %3d, %03d) and no % otherwise
+// but %%.
+bool HasOneNumber(const std::string& pattern)
+{
+    int numbers = 0;
+    for (size_t at = pattern.find('%'); at != std::string::npos; at = pattern.find('%', at)) {
+        size_t end = at + 1;
+        if (end < pattern.size() && pattern[end] == '%') {
+            at = end + 1;
+            continue;
+        }
+        while (end < pattern.size() && std::isdigit(static_cast<unsigned char>(pattern[end])) && end - at < 3)
+            ++end;
+        if (end >= pattern.size() || pattern[end] != 'd')
+            return false;
+        ++numbers;
+        at = end + 1;
+    }
+    return numbers == 1;
+}
+
 }  // namespace
 
 std::vector<std::string> Split(const std::string& text, char separator)
@@ -93,20 +123,66 @@ double ParseSeconds(const std::string& text, const std::string& what)
     return seconds;
 }
 
-Capture ParseCapture(const std::string& text)
+namespace {
+
+// "SECONDS=NAME" where NAME ends in .bmp, .jpg or .jpeg.
+Capture ParseTimeAndPicture(const std::string& text, const std::string& what)
 {
-    static const std::string what =
-        "TIME=FILE such as 2.5=shot.jpg or 1:02.5=shot.bmp (a .bmp, .jpg or .jpeg file)";
     const size_t equals = text.find('=');
     Expect(equals != std::string::npos, what);
     Capture capture;
     capture.seconds = ParseSeconds(text.substr(0, equals), what);
     capture.path = text.substr(equals + 1);
-    const size_t dot = capture.path.find_last_of('.');
-    const std::string extension = dot == std::string::npos ? "" : LowerCase(capture.path.substr(dot));
-    Expect(extension == ".bmp" || extension == ".jpg" || extension == ".jpeg", what);
-    capture.jpeg = extension != ".bmp";
+    capture.jpeg = IsJpegName(capture.path, what);
     return capture;
+}
+
+}  // namespace
+
+Capture ParseCapture(const std::string& text)
+{
+    return ParseTimeAndPicture(text, "TIME=FILE such as 2.5=shot.jpg or 1:02.5=shot.bmp (a .bmp, .jpg or .jpeg file)");
+}
+
+TimeRange ParseTimeRange(const std::string& text)
+{
+    static const std::string what = "FROM-UNTIL in seconds or h:mm:ss.mmm, such as 3-4.5 or 1:00-1:30 (UNTIL may "
+                                    "be left out)";
+    const size_t dash = text.find('-');
+    Expect(dash != std::string::npos, what);
+    TimeRange range;
+    range.from = ParseSeconds(text.substr(0, dash), what);
+    if (dash + 1 < text.size())
+        range.until = ParseSeconds(text.substr(dash + 1), what);
+    Expect(range.until > range.from, what);
+    return range;
+}
+
+Thumbnails ParseThumbnails(const std::string& text)
+{
+    static const std::string what = "SECONDS=PATTERN such as 10=thumb%03d.jpg (one %d for the number; a .bmp, .jpg "
+                                    "or .jpeg name)";
+    const Capture every = ParseTimeAndPicture(text, what);
+    Expect(every.seconds >= 0.001 && HasOneNumber(every.path), what);
+    return {every.seconds, every.path, every.jpeg};
+}
+
+int64_t ParseBitRate(const std::string& text)
+{
+    static const std::string what = "a bit rate such as 128k, 2.5M or 800000 (1k to 1000M)";
+    Expect(!text.empty(), what);
+    const char unit = static_cast<char>(std::tolower(static_cast<unsigned char>(text.back())));
+    const double scale = unit == 'k' ? 1e3 : unit == 'm' ? 1e6 : 1.0;
+    const double bits = Decimal(scale == 1.0 ? text : text.substr(0, text.size() - 1), what) * scale;
+    Expect(bits >= 1e3 && bits <= 1e9, what);
+    return static_cast<int64_t>(std::llround(bits));
+}
+
+double DecimalNumber(const std::string& text, double low, double high, const std::string& what)
+{
+    const double value = Decimal(text, what);
+    Expect(value >= low && value <= high, what);
+    return value;
 }
 
 tagRECT ParsePixelRect(const std::string& text, const std::string& what)

@@ -1,6 +1,7 @@
 #ifndef AVPOST_TOOLS_AVPOST_CLI_VALUES_H
 #define AVPOST_TOOLS_AVPOST_CLI_VALUES_H
 
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -28,6 +29,16 @@ double ParseFrameRate(const std::string& text);
 double ParseSeconds(const std::string& text, const std::string& what);
 // "SECONDS=FILE" where FILE ends in .bmp, .jpg or .jpeg.
 Capture ParseCapture(const std::string& text);
+// "FROM-UNTIL" in seconds or h:mm:ss.mmm; UNTIL may be left out (to the end).
+TimeRange ParseTimeRange(const std::string& text);
+// "SECONDS=PATTERN" where PATTERN holds one %d (or %03d and the like) and ends in .bmp, .jpg
+// or .jpeg; a literal % is written %%.
+Thumbnails ParseThumbnails(const std::string& text);
+// A bit rate in bits per second: 128000, 128k, 2.5M.
+int64_t ParseBitRate(const std::string& text);
+// A decimal number in [low, high].
+double DecimalNumber(const std::string& text, double low, double high, const std::string& what);
+
 // "W:H:X:Y" in whole pixels; the result as left, top, right, bottom.
 tagRECT ParsePixelRect(const std::string& text, const std::string& what);
 // "W:H:X:Y" in fractions of the output, inside it.

@@ -7,11 +7,11 @@
 #include <cstdio>
 #include <cstring>
 
-#include "avpost.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/demo/DemoSources.h"
 #include "tools/avpost/demo/DemoWatermarks.h"
 #include "tools/avpost/jobs/AudioJob.h"
+#include "tools/avpost/jobs/FileSinks.h"
 #include "tools/avpost/jobs/VideoJob.h"
 #include "tools/avpost/output/OutputFile.h"
 #include "tools/avpost/output/StandardOutput.h"
@@ -40,8 +40,10 @@ VideoSettings DemoVideoSettings(const std::string& folder)
     settings.frameRate = 30.0;
     settings.keepLastFrame = true;
     settings.deinterlace = DEINTERLACE_EVEN_INTERPOLATE;
-    settings.contrast = 10;
-    settings.saturation = 15;
+    settings.contrast.base = 10;
+    settings.saturation.base = 15;
+    // Settings can change between pictures: a stretch of sepia in the middle.
+    settings.filters.stretches.push_back({static_cast<int>(kFilterSepia), {kSepiaFrom, kSepiaUntil}});
     settings.watermark.hasRect = true;
     settings.watermark.rect = {452, 72, 628, 121};  // inside the picture, top right
     settings.watermark.level = 85;
@@ -82,14 +84,12 @@ VideoReport RunDemoVideo(const std::string& folder, bool showProgress)
     source.OpenFile("");
     const Bitmap32 logo = DemoLogo();
     const Bitmap32 badge = DemoUserBadge();
-    VideoJob job(source, "demo source", DemoVideoSettings(folder), &logo, &badge);
-    // Settings can change between pictures: a stretch of sepia in the middle.
-    job.beforePicture = [](double seconds, VideoDecoder* stage) {
-        PCSetExFilterFlag(stage, seconds >= kSepiaFrom && seconds < kSepiaUntil ? kFilterSepia : 0u);
-    };
+    const VideoSettings settings = DemoVideoSettings(folder);
+    VideoJob job(source, "demo source", settings, &logo, &badge);
     OutputFile output(folder + "/demo.y4m");
     Progress progress("video", source.TotalSeconds(), showProgress);
-    const VideoReport report = job.Run(output, progress);
+    Y4mSink sink(output, Y4mFormatOf(job, source.traits(), settings), progress);
+    const VideoReport report = job.Run(sink, Trim{});
     output.Commit();
     job.CommitCaptures();
     return report;
@@ -102,7 +102,9 @@ AudioReport RunDemoAudio(const std::string& folder, bool showProgress)
     AudioJob job(source, "demo source", DemoAudioSettings());
     OutputFile output(folder + "/demo.wav");
     Progress progress("audio", source.TotalSeconds(), showProgress);
-    const AudioReport report = job.Run(output, progress);
+    WavSink sink(output, WavFormat{job.format().sampleRate, job.format().channels, job.layout().mask}, progress);
+    const AudioReport report = job.Run(sink, Trim{});
+    sink.Finish();
     output.Commit();
     return report;
 }

@@ -4,7 +4,6 @@
 
 extern "C" {
 #include <libavutil/channel_layout.h>
-#include <libswresample/swresample.h>
 }
 
 #include "tools/avpost/common/ToolError.h"
@@ -25,6 +24,28 @@ ChannelLayout LayoutOf(const AVChannelLayout& layout)
 
 }  // namespace
 
+void DescribeAudioStream(const FfmpegInput& input, const FfmpegDecoding& decoding, STREAM_INFO& info,
+                         ChannelLayout& layout)
+{
+    const AVCodecParameters& codec = *decoding.stream().codecpar;
+    const int channels = codec.ch_layout.nb_channels;
+    if (channels < 1 || channels > kMostChannels)
+        Fail(input.name(), "unsupported channel count " + std::to_string(channels) + " (1 to " +
+                               std::to_string(kMostChannels) + ")");
+    if (codec.sample_rate <= 0)
+        Fail(input.name(), "audio stream has no sample rate");
+    info = STREAM_INFO{};
+    FillAudioInfo(info, codec.sample_rate, channels);
+    layout = Resolved(LayoutOf(codec.ch_layout));
+    info.firstTime = decoding.StartUnits();
+    info.startOffset = decoding.OffsetInFileUnits();
+}
+
+StampClock SampleClock(const FfmpegDecoding& decoding, int sampleRate)
+{
+    return StampClock(kUnitsPerSecond / sampleRate, std::min(decoding.TickUnits(), kMostStampWobble));
+}
+
 FfmpegAudioDecoder::~FfmpegAudioDecoder()
 {
     Close();
@@ -34,30 +55,20 @@ void FfmpegAudioDecoder::OpenFile(const std::string& path)
 {
     Close();
     stream_ = std::make_unique<FfmpegStream>(path, AVMEDIA_TYPE_AUDIO);
-    const AVCodecParameters& codec = *stream_->stream().codecpar;
-    const int channels = codec.ch_layout.nb_channels;
-    if (channels < 1 || channels > kMostChannels)
-        Fail(path, "unsupported channel count " + std::to_string(channels) + " (1 to " +
-                       std::to_string(kMostChannels) + ")");
-    if (codec.sample_rate <= 0)
-        Fail(path, "audio stream has no sample rate");
-    info_ = STREAM_INFO{};
-    FillAudioInfo(info_, codec.sample_rate, channels);
-    layout_ = Resolved(LayoutOf(codec.ch_layout));
-    info_.firstTime = stream_->StartUnits();
-    info_.startOffset = stream_->OffsetInFileUnits();
+    DescribeAudioStream(stream_->input(), stream_->decoding(), info_, layout_);
     nextTime_ = info_.firstTime;
-    clock_ = StampClock(kUnitsPerSecond / codec.sample_rate, std::min(stream_->TickUnits(), kMostStampWobble));
+    clock_ = SampleClock(stream_->decoding(), info_.audio.sampleRate);
+    converter_ = std::make_unique<SampleConverter>(info_.audio.sampleRate, info_.audio.channels, stream_->name());
 }
 
 double FfmpegAudioDecoder::TotalSeconds() const
 {
-    return stream_ ? stream_->DurationSeconds() : 0.0;
+    return stream_ ? stream_->input().DurationSeconds() : 0.0;
 }
 
 void FfmpegAudioDecoder::Close()
 {
-    swr_free(&converter_);
+    converter_.reset();
     stream_.reset();
     held_ = false;
 }
@@ -67,40 +78,11 @@ bool FfmpegAudioDecoder::DecodeNext()
     const AVFrame* frame = stream_->NextFrame();
     if (frame == nullptr)
         return false;
-    const int frames = Convert(*frame);
-    const int64_t start = clock_.Next(stream_->FrameStamp(*frame), frames);
+    const int frames = converter_->Convert(*frame, samples_);
+    const int64_t start = clock_.Next(stream_->decoding().FrameStamp(*frame), frames);
     DescribeAudioBlock(block_, info_, samples_.data(), frames * info_.audio.channels * 2, start);
     nextTime_ = start + block_.duration;
     return true;
-}
-
-// Converts whatever the decoder gives (planar, float) into interleaved 16-bit samples of the
-// stream's announced rate, channels in the order of its layout; returns the sample frames made.
-int FfmpegAudioDecoder::Convert(const AVFrame& frame)
-{
-    if (converter_ == nullptr) {
-        // The frame's own layout when it has the announced channels: no mixing, only the
-        // sample format changes.
-        AVChannelLayout layout{};
-        if (frame.ch_layout.nb_channels != info_.audio.channels || av_channel_layout_copy(&layout, &frame.ch_layout) < 0)
-            av_channel_layout_default(&layout, info_.audio.channels);
-        // FFmpeg 5 declares the input layout non-const; it only reads it.
-        const int code = swr_alloc_set_opts2(&converter_, &layout, AV_SAMPLE_FMT_S16, info_.audio.sampleRate,
-                                             const_cast<AVChannelLayout*>(&frame.ch_layout),
-                                             static_cast<AVSampleFormat>(frame.format),
-                                             frame.sample_rate, 0, nullptr);
-        av_channel_layout_uninit(&layout);
-        if (code < 0 || swr_init(converter_) < 0)
-            Fail(stream_->name(), "cannot convert its audio samples to 16-bit PCM");
-    }
-    const int room = swr_get_out_samples(converter_, frame.nb_samples);
-    samples_.resize(static_cast<size_t>(std::max(room, 0)) * static_cast<size_t>(info_.audio.channels) * 2);
-    uint8_t* out[1] = {samples_.data()};
-    const int made = swr_convert(converter_, out, room, const_cast<const uint8_t**>(frame.extended_data),
-                                 frame.nb_samples);
-    if (made < 0)
-        Fail(stream_->name(), "cannot convert its audio samples to 16-bit PCM");
-    return made;
 }
 
 MEDIA_FRAME* FfmpegAudioDecoder::GetNextFrame()
@@ -125,7 +107,7 @@ double FfmpegAudioDecoder::Seek(double seconds)
     Guarded([&] {
         stream_->SeekBefore(target);
         clock_.Restart();
-        swr_free(&converter_);
+        converter_->Restart();
         // Decode from the key frame up to the block that covers the target; it is handed out next.
         while ((landed = DecodeNext()) && block_.startTime + block_.duration <= target) {
         }

@@ -4,13 +4,20 @@
 #include <memory>
 #include <vector>
 
+#include "tools/avpost/ffmpeg/FfmpegSamples.h"
 #include "tools/avpost/ffmpeg/FfmpegStream.h"
 #include "tools/avpost/sources/Sources.h"
 #include "tools/avpost/sources/StampClock.h"
 
-struct SwrContext;
-
 namespace avpost::tool {
+
+// The stream information and speaker layout of a sound stream as the stages take them: its
+// rate and channels as 16-bit samples, its start and offset in the file. Throws ToolError for
+// a stream the tool cannot handle.
+void DescribeAudioStream(const FfmpegInput& input, const FfmpegDecoding& decoding, STREAM_INFO& info,
+                         ChannelLayout& layout);
+// The clock that evens out the stream's block stamps.
+StampClock SampleClock(const FfmpegDecoding& decoding, int sampleRate);
 
 // An audio source over any file FFmpeg's libraries read: one block per decoded frame, as
 // interleaved 16-bit samples at the stream's own rate and channel count, stamped with the
@@ -31,10 +38,9 @@ public:
 
 private:
     bool DecodeNext();
-    int Convert(const AVFrame& frame);
 
     std::unique_ptr<FfmpegStream> stream_;
-    SwrContext* converter_ = nullptr;
+    std::unique_ptr<SampleConverter> converter_;
     std::vector<unsigned char> samples_;
     MEDIA_FRAME block_{};
     bool held_ = false;     // block_ was decoded by Seek and not handed out yet

@@ -5,10 +5,8 @@
 #include <memory>
 #include <string>
 
-extern "C" {
-#include <libavcodec/avcodec.h>
-#include <libavformat/avformat.h>
-}
+#include "tools/avpost/ffmpeg/FfmpegDecoding.h"
+#include "tools/avpost/ffmpeg/FfmpegInput.h"
 
 namespace avpost::tool {
 
@@ -27,46 +25,19 @@ public:
     // and drops what the decoder held.
     void SeekBefore(int64_t units);
 
-    const AVStream& stream() const { return *format_->streams[index_]; }
-    AVFormatContext& format() const { return *format_; }
-    const std::string& name() const { return name_; }
-
-    // A time stamp of this stream in 100 ns units.
-    int64_t ToUnits(int64_t timestamp) const;
-    // The stamp of a decoded frame in 100 ns units, or StampClock::kNoStamp.
-    int64_t FrameStamp(const AVFrame& frame) const;
-    // One tick of the stream's clock in 100 ns units (at least 1).
-    int64_t TickUnits() const;
-    // Where this stream begins on its own clock, and how far after the file's earliest
-    // stream that is (100 ns units; 0 when unknown).
-    int64_t StartUnits() const;
-    int64_t OffsetInFileUnits() const;
-    // Length of the file in seconds, 0 when unknown.
-    double DurationSeconds() const;
+    const FfmpegInput& input() const { return input_; }
+    const FfmpegDecoding& decoding() const { return *decoding_; }
+    const AVStream& stream() const { return decoding_->stream(); }
+    const std::string& name() const { return input_.name(); }
 
 private:
-    struct FormatCloser {
-        void operator()(AVFormatContext* format) const { avformat_close_input(&format); }
-    };
-    struct CodecFreer {
-        void operator()(AVCodecContext* codec) const { avcodec_free_context(&codec); }
-    };
     struct PacketFreer {
         void operator()(AVPacket* packet) const { av_packet_free(&packet); }
     };
-    struct FrameFreer {
-        void operator()(AVFrame* frame) const { av_frame_free(&frame); }
-    };
 
-    bool SendNextPacket();
-    [[noreturn]] void FailWith(const char* what, int code) const;
-
-    std::string name_;
-    std::unique_ptr<AVFormatContext, FormatCloser> format_;
-    std::unique_ptr<AVCodecContext, CodecFreer> codec_;
+    FfmpegInput input_;
+    std::unique_ptr<FfmpegDecoding> decoding_;
     std::unique_ptr<AVPacket, PacketFreer> packet_;
-    std::unique_ptr<AVFrame, FrameFreer> frame_;
-    int index_ = -1;
     bool draining_ = false;
 };
 

@@ -5,8 +5,6 @@
 
 extern "C" {
 #include <libavutil/display.h>
-#include <libavutil/pixdesc.h>
-#include <libswscale/swscale.h>
 }
 
 #include "tools/avpost/common/ToolError.h"
@@ -61,6 +59,32 @@ const char* ChromaSiting(AVChromaLocation location)
 
 }  // namespace
 
+void DescribeVideoStream(const FfmpegInput& input, const FfmpegDecoding& decoding, STREAM_INFO& info,
+                         PictureTraits& traits)
+{
+    AVStream* stream = const_cast<AVStream*>(&decoding.stream());
+    const int width = stream->codecpar->width;
+    const int height = stream->codecpar->height;
+    if (width <= 0 || height <= 0 || width > 16384 || height > 16384)
+        Fail(input.name(), "video stream has an unusable picture size");
+    const AVRational rate = av_guess_frame_rate(&input.format(), stream, nullptr);
+    const AVRational shape = av_guess_sample_aspect_ratio(&input.format(), stream, nullptr);
+    info = STREAM_INFO{};
+    FillVideoInfo(info, width, height, rate.num > 0 && rate.den > 0 ? av_q2d(rate) : 0.0,
+                  DisplayAspect(width, height, Ratio{shape.num, shape.den}));
+    traits = PictureTraits{FieldOrder(stream->codecpar->field_order), ChromaSiting(stream->codecpar->chroma_location),
+                           UprightTurn(*stream)};
+    info.firstTime = decoding.StartUnits();
+    info.startOffset = decoding.OffsetInFileUnits();
+}
+
+StampClock PictureClock(const FfmpegDecoding& decoding, double frameRate)
+{
+    // Stamps may wobble by a tick of the container's clock, but never by a quarter picture.
+    const double pictureUnits = frameRate > 0.0 ? kUnitsPerSecond / frameRate : 0.0;
+    return StampClock(pictureUnits, std::min<int64_t>(decoding.TickUnits(), static_cast<int64_t>(pictureUnits / 4)));
+}
+
 FfmpegVideoDecoder::~FfmpegVideoDecoder()
 {
     Close();
@@ -70,41 +94,23 @@ void FfmpegVideoDecoder::OpenFile(const std::string& path)
 {
     Close();
     stream_ = std::make_unique<FfmpegStream>(path, AVMEDIA_TYPE_VIDEO);
-    AVStream* stream = const_cast<AVStream*>(&stream_->stream());
-    const int width = stream->codecpar->width;
-    const int height = stream->codecpar->height;
-    if (width <= 0 || height <= 0 || width > 16384 || height > 16384)
-        Fail(path, "video stream has an unusable picture size");
-
-    const AVRational rate = av_guess_frame_rate(&stream_->format(), stream, nullptr);
-    const AVRational shape = av_guess_sample_aspect_ratio(&stream_->format(), stream, nullptr);
-    info_ = STREAM_INFO{};
-    FillVideoInfo(info_, width, height, rate.num > 0 && rate.den > 0 ? av_q2d(rate) : 0.0,
-                  DisplayAspect(width, height, Ratio{shape.num, shape.den}));
-    traits_ = PictureTraits{FieldOrder(stream->codecpar->field_order), ChromaSiting(stream->codecpar->chroma_location),
-                            UprightTurn(*stream)};
-    info_.firstTime = stream_->StartUnits();
-    info_.startOffset = stream_->OffsetInFileUnits();
-    // Stamps may wobble by a tick of the container's clock, but never by a quarter picture.
-    const double pictureUnits = info_.video.frameRate > 0.0 ? kUnitsPerSecond / info_.video.frameRate : 0.0;
-    clock_ = StampClock(pictureUnits, std::min<int64_t>(stream_->TickUnits(), static_cast<int64_t>(pictureUnits / 4)));
-
-    picture_.reset(CreateYV12Frame(width, height, false, true));
+    DescribeVideoStream(stream_->input(), stream_->decoding(), info_, traits_);
+    clock_ = PictureClock(stream_->decoding(), info_.video.frameRate);
+    converter_ = std::make_unique<PictureConverter>(info_.video.width, info_.video.height, stream_->name());
     if (!DecodeNext())
         Fail(path, "video stream holds no pictures");
 }
 
 double FfmpegVideoDecoder::TotalSeconds() const
 {
-    return stream_ ? stream_->DurationSeconds() : 0.0;
+    return stream_ ? stream_->input().DurationSeconds() : 0.0;
 }
 
 void FfmpegVideoDecoder::Close()
 {
-    sws_freeContext(scaler_);
-    scaler_ = nullptr;
+    converter_.reset();
     stream_.reset();
-    picture_.reset();
+    frame_.reset();
 }
 
 bool FfmpegVideoDecoder::DecodeNext()
@@ -112,25 +118,12 @@ bool FfmpegVideoDecoder::DecodeNext()
     const AVFrame* frame = stream_->NextFrame();
     if (frame == nullptr)
         return false;
-    Convert(*frame);
+    frame_ = converter_->Convert(*frame);
+    DescribePicture(*frame_, picture_);
     const double rate = info_.video.frameRate;
-    picture_->duration = rate > 0.0 ? static_cast<int32_t>(ToUnits(1.0 / rate)) : 0;
-    picture_->startTime = picture_->streamTime = clock_.Next(stream_->FrameStamp(*frame), 1);
+    picture_.duration = rate > 0.0 ? static_cast<int32_t>(ToUnits(1.0 / rate)) : 0;
+    picture_.startTime = picture_.streamTime = clock_.Next(stream_->decoding().FrameStamp(*frame), 1);
     return true;
-}
-
-void FfmpegVideoDecoder::Convert(const AVFrame& frame)
-{
-    scaler_ = sws_getCachedContext(scaler_, frame.width, frame.height, static_cast<AVPixelFormat>(frame.format),
-                                   picture_->width, picture_->height, AV_PIX_FMT_YUV420P, SWS_BICUBIC, nullptr,
-                                   nullptr, nullptr);
-    if (scaler_ == nullptr) {
-        const char* format = av_get_pix_fmt_name(static_cast<AVPixelFormat>(frame.format));
-        Fail(stream_->name(), std::string("cannot convert pictures of pixel format ") + (format ? format : "unknown"));
-    }
-    uint8_t* planes[4] = {picture_->plane[0], picture_->plane[1], picture_->plane[2], nullptr};
-    int pitches[4] = {picture_->pitch[0], picture_->pitch[1], picture_->pitch[2], 0};
-    sws_scale(scaler_, frame.data, frame.linesize, 0, frame.height, planes, pitches);
 }
 
 int FfmpegVideoDecoder::Forward(int count)
@@ -149,7 +142,7 @@ double FfmpegVideoDecoder::Seek(double seconds, unsigned)
         stream_->SeekBefore(target);
         clock_.Restart();
         // Decode from the key frame up to the picture that covers the target.
-        while (DecodeNext() && picture_->startTime + picture_->duration <= target) {
+        while (DecodeNext() && picture_.startTime + picture_.duration <= target) {
         }
     });
     return GetOffset();
@@ -157,7 +150,7 @@ double FfmpegVideoDecoder::Seek(double seconds, unsigned)
 
 double FfmpegVideoDecoder::GetOffset() const
 {
-    return picture_ ? static_cast<double>(picture_->startTime - info_.firstTime) / kUnitsPerSecond : 0.0;
+    return frame_ ? static_cast<double>(picture_.startTime - info_.firstTime) / kUnitsPerSecond : 0.0;
 }
 
 }  // namespace avpost::tool

@@ -3,9 +3,6 @@
 #include "avpost.h"
 #include "tools/avpost/common/Interruption.h"
 #include "tools/avpost/common/ToolError.h"
-#include "tools/avpost/formats/Wav.h"
-#include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/report/Progress.h"
 #include "tools/avpost/sources/AudioAdapter.h"
 #ifdef AVPOST_TOOL_HAVE_FFMPEG
 #include "tools/avpost/ffmpeg/FfmpegDownmix.h"
@@ -21,7 +18,8 @@ constexpr int kMostResampledChannels = 2;
 }  // namespace
 
 AudioJob::AudioJob(AudioSource& source, const std::string& inputName, const AudioSettings& settings)
-    : source_(source), inputName_(inputName), plan_(PlanChannels(source.layout(), settings.channels))
+    : source_(source), inputName_(inputName), plan_(PlanChannels(source.layout(), settings.channels)),
+      continuous_(settings.continuous)
 {
     const STREAM_INFO::AUDIO& input = source.GetStreamInfo()->audio;
     const int rate = settings.sampleRate != 0 ? settings.sampleRate : input.sampleRate;
@@ -54,29 +52,33 @@ AudioDecoder& AudioJob::Adapted(AudioSource& source)
 #endif
 }
 
-AudioReport AudioJob::Run(OutputFile& output, Progress& progress)
+AudioReport AudioJob::Run(SampleSink& sink, const Trim& trim)
 {
     AudioReport report;
-    const STREAM_INFO::AUDIO& format = stage_->GetStreamInfo()->audio;
-    report.sampleRate = format.sampleRate;
+    const STREAM_INFO::AUDIO& output = format();
+    report.sampleRate = output.sampleRate;
     report.layout = plan_.output;
     report.notes = notes_;
-    WavWriter writer(output, WavFormat{format.sampleRate, format.channels, plan_.output.mask});
-    const double bytesPerSecond = static_cast<double>(format.sampleRate) * format.channels * 2;
+    if (trim.start > 0.0)
+        PCAudioSeek(stage_.get(), trim.start);
+    // A continuous stage stamps its blocks on the consumer's time line; others pass on the
+    // decoder's stamps.
+    const STREAM_INFO& stream = *stage_->GetStreamInfo();
+    const int64_t toTimeLine = continuous_ ? 0 : int64_t{stream.startOffset} - int64_t{stream.firstTime};
+    SampleWindow window(trim, output.sampleRate, output.channels * 2, trim.start > 0.0);
 
     while (const MEDIA_FRAME* block = stage_->GetNextFrame()) {
         StopIfInterrupted();
-        if (block->param1 != format.sampleRate || block->param2 != format.channels || block->bitsPerSample != 16)
+        if (block->param1 != output.sampleRate || block->param2 != output.channels || block->bitsPerSample != 16)
             Fail(inputName_, "changes its sample format part-way; avpost writes one format per file");
-        writer.Write(block->data, static_cast<size_t>(block->dataSize));
-        progress.Update(static_cast<double>(writer.bytesWritten()) / bytesPerSecond, 0);
+        if (!window.Pass(block->data, static_cast<size_t>(block->dataSize), block->startTime + toTimeLine, sink))
+            break;
     }
     StopIfInterrupted();
     if (!source_.failure().empty())
         throw ToolError(source_.failure());
-    writer.Finish();
     report.secondsIn = tally_->received();
-    report.secondsOut = static_cast<double>(writer.bytesWritten()) / bytesPerSecond;
+    report.secondsOut = static_cast<double>(window.framesPassed()) / output.sampleRate;
     report.gaps = tally_->gaps();
     report.overlaps = tally_->overlaps();
     return report;

@@ -7,13 +7,11 @@
 
 #include "tools/avpost/cli/Settings.h"
 #include "tools/avpost/jobs/ChannelPlan.h"
+#include "tools/avpost/jobs/SampleWindow.h"
 #include "tools/avpost/sources/Sources.h"
 #include "tools/avpost/sources/Tally.h"
 
 namespace avpost::tool {
-
-class OutputFile;
-class Progress;
 
 struct AudioReport {
     double secondsIn = 0.0;   // sound the decoder delivered
@@ -26,7 +24,7 @@ struct AudioReport {
 };
 
 // The main job for sound: the audio stage over a decoder, converting rate and channels,
-// scaling the volume and, when asked, making the time line continuous; written as WAV.
+// scaling the volume and, when asked, making the time line continuous; handed to a sink.
 class AudioJob {
 public:
     // Creates the stage; throws ToolError for a conversion that cannot be done.
@@ -35,8 +33,15 @@ public:
     AudioJob(const AudioJob&) = delete;
     AudioJob& operator=(const AudioJob&) = delete;
 
-    // Pulls every block through the stage into output.
-    AudioReport Run(OutputFile& output, Progress& progress);
+    // The sound that comes out: rate, channels, 16 bits.
+    const STREAM_INFO::AUDIO& format() const { return stage_->GetStreamInfo()->audio; }
+    // Where the channels of the sound that comes out go.
+    ChannelLayout layout() const { return plan_.output; }
+
+    // Pulls the sound of the trim (seeking the stage to its start) through the stage into
+    // sink. Throws ToolError when the decoder gave up on damaged input or the format changes
+    // part-way.
+    AudioReport Run(SampleSink& sink, const Trim& trim);
 
 private:
     AudioDecoder& Adapted(AudioSource& source);
@@ -44,6 +49,7 @@ private:
     AudioSource& source_;
     std::string inputName_;
     ChannelPlan plan_;
+    bool continuous_;
     std::vector<std::string> notes_;
     std::unique_ptr<AudioDecoder> adapter_;  // between the decoder and the tally, when the channels need one
     std::unique_ptr<AudioTally> tally_;

@@ -9,6 +9,7 @@
 #include "tools/avpost/formats/Bmp.h"
 #include "tools/avpost/formats/InputFile.h"
 #include "tools/avpost/jobs/AudioJob.h"
+#include "tools/avpost/jobs/FileSinks.h"
 #include "tools/avpost/jobs/VideoJob.h"
 #include "tools/avpost/output/OutputFile.h"
 #include "tools/avpost/output/StandardOutput.h"
@@ -37,13 +38,6 @@ void CheckOutputName(const std::string& path, const char* extension, const char*
                        ", or - to pipe it into an encoder");
 }
 
-std::optional<Bitmap32> LoadIfGiven(const std::string& path)
-{
-    if (path.empty())
-        return std::nullopt;
-    return LoadWatermarkImage(path);
-}
-
 void Report(const Invocation& call, const std::string& description, const std::vector<std::string>& notes)
 {
     if (!call.quiet)
@@ -55,19 +49,29 @@ void Report(const Invocation& call, const std::string& description, const std::v
 
 }  // namespace
 
+#ifndef AVPOST_TOOL_HAVE_FFMPEG
+void RunConvertCommand(const Invocation&)
+{
+    Fail("avpost convert", "needs FFmpeg's libraries to encode, and this avpost was built without them; "
+                           "avpost video and avpost audio write Y4M and WAV");
+}
+#endif
+
 void RunVideoCommand(const Invocation& call)
 {
     CheckOutputName(call.output, ".y4m", "Y4M video");
     std::unique_ptr<VideoSource> source = OpenVideoInput(call.input);
-    const std::optional<Bitmap32> watermark = LoadIfGiven(call.video.watermark.image);
-    const std::optional<Bitmap32> userWatermark = LoadIfGiven(call.video.userWatermark.image);
+    const std::optional<Bitmap32> watermark = LoadWatermarkIfGiven(call.video.watermark.image);
+    const std::optional<Bitmap32> userWatermark = LoadWatermarkIfGiven(call.video.userWatermark.image);
 
     DivertLibraryOutput();
     VideoJob job(*source, InputName(call.input), call.video, watermark ? &*watermark : nullptr,
                  userWatermark ? &*userWatermark : nullptr);
     OutputFile output(call.output);
-    Progress progress("video", source->TotalSeconds(), !call.quiet && Progress::IsTerminal(stderr));
-    const VideoReport report = job.Run(output, progress);
+    Progress progress("video", SpanSeconds(source->TotalSeconds(), call.trim),
+                      !call.quiet && Progress::IsTerminal(stderr));
+    Y4mSink sink(output, Y4mFormatOf(job, source->traits(), call.video), progress);
+    const VideoReport report = job.Run(sink, call.trim);
     output.Commit();
     job.CommitCaptures();
     progress.Finish();
@@ -82,8 +86,11 @@ void RunAudioCommand(const Invocation& call)
     DivertLibraryOutput();
     AudioJob job(*source, InputName(call.input), call.audio);
     OutputFile output(call.output);
-    Progress progress("audio", source->TotalSeconds(), !call.quiet && Progress::IsTerminal(stderr));
-    const AudioReport report = job.Run(output, progress);
+    Progress progress("audio", SpanSeconds(source->TotalSeconds(), call.trim),
+                      !call.quiet && Progress::IsTerminal(stderr));
+    WavSink sink(output, WavFormat{job.format().sampleRate, job.format().channels, job.layout().mask}, progress);
+    const AudioReport report = job.Run(sink, call.trim);
+    sink.Finish();
     output.Commit();
     progress.Finish();
     Report(call, AudioSummary(report, call.audio.continuous), report.notes);

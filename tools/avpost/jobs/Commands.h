@@ -5,7 +5,8 @@
 
 namespace avpost::tool {
 
-// The three commands; each throws ToolError when it fails and then leaves no output behind.
+// The commands; each throws ToolError when it fails and then leaves no output behind.
+void RunConvertCommand(const Invocation& call);
 void RunVideoCommand(const Invocation& call);
 void RunAudioCommand(const Invocation& call);
 void RunDemoCommand(const Invocation& call);

@@ -1,15 +1,13 @@
 #include "tools/avpost/jobs/VideoJob.h"
 
 #include <algorithm>
+#include <climits>
 #include <cmath>
 
 #include "avpost.h"
 #include "tools/avpost/common/Interruption.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/common/Utf8.h"
-#include "tools/avpost/formats/Y4m.h"
-#include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/report/Progress.h"
 #include "tools/avpost/report/Summary.h"
 #include "tools/avpost/sources/TurnedVideo.h"
 
@@ -48,12 +46,10 @@ tagRECT AlignedPlace(const Bitmap32& image, int align, int width, int height)
 VideoJob::VideoJob(VideoSource& source, const std::string& inputName, const VideoSettings& settings,
                    const Bitmap32* watermark, const Bitmap32* userWatermark)
     : source_(source), inputName_(inputName), settings_(settings),
-      turn_(settings.rotation == kRotateAuto ? source.traits().rotation : settings.rotation),
-      captured_(settings.captures.size(), false)
+      turn_(settings.rotation == kRotateAuto ? source.traits().rotation : settings.rotation), look_(settings_),
+      captures_(settings.captures, settings.thumbnails)
 {
     tally_ = std::make_unique<VideoTally>(Turned(source));
-    for (const Capture& capture : settings.captures)
-        captureFiles_.push_back(std::make_unique<StagedPath>(capture.path));
     const STREAM_INFO* info = source.GetStreamInfo();
     if (settings.frameRate <= 0.0 && !(info->video.frameRate > 0.0))
         Fail(inputName, "does not give its frame rate; choose one with --fps");
@@ -64,10 +60,7 @@ VideoJob::VideoJob(VideoSource& source, const std::string& inputName, const Vide
     stage_.reset(PCVideoInit(tally_.get(), settings.hasRequest ? &request : nullptr, settings.frameRate,
                              settings.keepLastFrame));
     VideoDecoder* stage = stage_.get();
-    PCSetVideoBrightness(stage, settings.brightness);
-    PCSetContrast(stage, settings.contrast);
-    PCSetVideoSaturation(stage, settings.saturation);
-    PCSetExFilterFlag(stage, settings.filters);
+    look_.Apply(stage, 0.0);
     PCSetFlipFlag(stage, settings.flips);
     PCSetVideoDeintelace(stage, settings.deinterlace);
     if (settings.hasCrop)
@@ -118,80 +111,98 @@ void VideoJob::SetWatermarks(const Bitmap32* watermark, const Bitmap32* userWate
     }
 }
 
-// Takes every capture whose time has come (all that are left at the end).
-void VideoJob::CaptureDue(double seconds, bool atEnd, VideoReport& report)
+void VideoJob::Capture(double seconds, bool atEnd, VideoReport& report)
 {
-    for (size_t i = 0; i < settings_.captures.size(); ++i) {
-        const Capture& capture = settings_.captures[i];
-        if (captured_[i] || (capture.seconds > seconds + 1e-9 && !atEnd))
-            continue;
-        captured_[i] = true;
-        const StagedPath& file = *captureFiles_[i];
-        std::wstring path = WideFromUtf8(file.temporary());
-        if (PCCaptureImage(stage_.get(), path.data(), capture.jpeg ? 1 : 0, 0) != 1 || !file.HasContent())
-            Fail(capture.path, "the picture could not be written");
-        if (capture.seconds > seconds + 1e-9)
-            report.notes.push_back("--capture " + capture.path + ": the output ends before " +
-                                   FixedText(capture.seconds, 3) + " s; its last picture was taken");
+    captures_.Due(
+        seconds, atEnd,
+        [&](const std::string& path, bool jpeg) {
+            std::wstring wide = WideFromUtf8(path);
+            return PCCaptureImage(stage_.get(), wide.data(), jpeg ? 1 : 0, 0) == 1;
+        },
+        report.notes);
+}
+
+Ratio VideoJob::pixelAspect() const
+{
+    // The stage gives no aspect for square pixels (and passes on none from a source without one).
+    const STREAM_INFO::VIDEO& output = format();
+    const Ratio display{output.aspectX, output.aspectY};
+    return display.known() ? PixelAspect(output.width, output.height, display) : Ratio{1, 1};
+}
+
+double VideoJob::TickStart(const Trim& trim) const
+{
+    const double rate = format().frameRate;
+    return static_cast<double>(std::llround(trim.start * rate)) / rate;
+}
+
+long long VideoJob::PictureLimit(const Trim& trim) const
+{
+    return std::isfinite(trim.duration) ? std::max(1LL, std::llround(trim.duration * format().frameRate)) : LLONG_MAX;
+}
+
+// Seeks the stage to the tick nearest to start; returns how many ticks after it the stage
+// landed (a stream that begins later than start).
+long long VideoJob::SeekTo(double start)
+{
+    const double rate = format().frameRate;
+    const long long wanted = std::llround(start * rate);
+    PCVideoSeek(stage_.get(), start, 0);
+    long long at = std::llround(stage_->GetOffset() * rate);
+    while (at < wanted) {
+        StopIfInterrupted();
+        if (stage_->Forward(1) < 1) {
+            if (!source_.failure().empty())
+                throw ToolError(source_.failure());
+            Fail(inputName_, "ends before --start " + FixedText(start, 3) + " s");
+        }
+        ++at;
     }
+    return at - wanted;
 }
 
-void VideoJob::CommitCaptures()
-{
-    for (const std::unique_ptr<StagedPath>& file : captureFiles_)
-        file->Commit();
-}
-
-VideoReport VideoJob::Run(OutputFile& output, Progress& progress)
+VideoReport VideoJob::Run(PictureSink& sink, const Trim& trim)
 {
     VideoReport report;
-    const STREAM_INFO::VIDEO& format = stage_->GetStreamInfo()->video;
-    report.width = format.width;
-    report.height = format.height;
-    report.frameRate = format.frameRate;
+    const STREAM_INFO::VIDEO& output = format();
+    report.width = output.width;
+    report.height = output.height;
+    report.frameRate = output.frameRate;
 
-    Y4mFormat y4m;
-    y4m.width = format.width;
-    y4m.height = format.height;
-    y4m.frameRate = RateFraction(format.frameRate);
-    // The stage gives no aspect for square pixels (and passes on none from a source without one).
-    const Ratio display{format.aspectX, format.aspectY};
-    y4m.pixelAspect = display.known() ? PixelAspect(format.width, format.height, display) : Ratio{1, 1};
-    // A turned picture has no fields, and its chroma sits where no name says.
-    const PictureTraits& input = source_.traits();
-    y4m.interlace = settings_.deinterlace != DEINTERLACE_NONE ? 'p' : turn_ != 0 ? '?' : input.interlace;
-    if (turn_ == 0 && !input.chroma.empty())
-        y4m.chroma = input.chroma;
-    Y4mWriter writer(output, y4m);
-
+    long long late = trim.start > 0.0 ? SeekTo(trim.start) : 0;
+    const long long limit = PictureLimit(trim);
     long long distinct = 0;
     int64_t lastShown = -1;
     double seconds = 0.0;
-    do {
+    while (report.picturesOut < limit) {
         StopIfInterrupted();
-        seconds = static_cast<double>(report.picturesOut) / format.frameRate;
-        if (beforePicture)
-            beforePicture(seconds, stage_.get());
+        seconds = static_cast<double>(report.picturesOut) / output.frameRate;
+        look_.Apply(stage_.get(), seconds);
         const MEDIA_FRAME* picture = stage_->GetFrame();
         if (picture == nullptr)
             break;
-        writer.WritePicture(*picture);
-        CaptureDue(seconds, false, report);
+        sink.Write(*picture, seconds);
+        Capture(seconds, false, report);
         const int64_t shown = tally_->current();
         (shown == lastShown ? report.repeated : distinct) += 1;
         lastShown = shown;
         ++report.picturesOut;
-        progress.Update(seconds, report.picturesOut);
-    } while (stage_->Forward(1) >= 1);
+        // A stream that begins after the start shows its first picture from the start on.
+        if (late > 0)
+            --late;
+        else if (report.picturesOut < limit && stage_->Forward(1) < 1)
+            break;
+    }
     StopIfInterrupted();
 
     if (!source_.failure().empty())
         throw ToolError(source_.failure());
     if (report.picturesOut == 0)
         Fail(inputName_, "no picture came out of the video stage");
-    CaptureDue(seconds, true, report);
+    Capture(seconds, true, report);
     report.picturesIn = tally_->delivered();
-    report.dropped = report.picturesIn - distinct;
+    report.dropped = std::max(0LL, report.picturesIn - distinct);
+    report.thumbnails = captures_.thumbnailsTaken();
     return report;
 }
 

@@ -1,20 +1,18 @@
 #ifndef AVPOST_TOOLS_AVPOST_JOBS_VIDEOJOB_H
 #define AVPOST_TOOLS_AVPOST_JOBS_VIDEOJOB_H
 
-#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "tools/avpost/cli/Settings.h"
 #include "tools/avpost/formats/Bmp.h"
-#include "tools/avpost/output/OutputFile.h"
+#include "tools/avpost/jobs/Captures.h"
+#include "tools/avpost/jobs/TimedLook.h"
 #include "tools/avpost/sources/Sources.h"
 #include "tools/avpost/sources/Tally.h"
 
 namespace avpost::tool {
-
-class Progress;
 
 struct VideoReport {
     long long picturesIn = 0;   // delivered by the decoder
@@ -24,12 +22,21 @@ struct VideoReport {
     int width = 0;
     int height = 0;
     double frameRate = 0.0;
+    int thumbnails = 0;
     std::vector<std::string> notes;  // things the user should know, one line each
+};
+
+// Where the pictures of a video run go.
+class PictureSink {
+public:
+    virtual ~PictureSink() = default;
+    // One output picture, `seconds` from the output's start; valid during the call only.
+    virtual void Write(const MEDIA_FRAME& picture, double seconds) = 0;
 };
 
 // The main job for pictures: the video stage over a decoder (turned upright first when the
 // input or the settings say so), configured from the settings through the exported
-// functions, its pictures written as Y4M and captured where asked.
+// functions, its pictures handed to a sink and captured where asked.
 class VideoJob {
 public:
     // Creates and configures the stage; throws ToolError for settings that do not fit the
@@ -39,21 +46,31 @@ public:
     VideoJob(const VideoJob&) = delete;
     VideoJob& operator=(const VideoJob&) = delete;
 
-    // Called before each output picture is drawn, with its time in seconds and the stage, so
-    // that a host can change settings along the way.
-    std::function<void(double seconds, VideoDecoder* stage)> beforePicture;
+    // The pictures that come out: size, constant rate and display aspect (0:0 for square
+    // pixels).
+    const STREAM_INFO::VIDEO& format() const { return stage_->GetStreamInfo()->video; }
+    // The shape of the pixels that come out (1:1 when the stage says nothing of it).
+    Ratio pixelAspect() const;
+    // Clockwise degrees the pictures are turned before the stage.
+    int turn() const { return turn_; }
+    // The first output tick of a trim: its start on the output rate's ticks, the nearest one.
+    double TickStart(const Trim& trim) const;
+    // Pictures in a trim's duration (all of them for an unlimited one).
+    long long PictureLimit(const Trim& trim) const;
 
-    // Pulls every picture through the stage into output. Throws ToolError when the decoder
-    // gave up on damaged input or a capture could not be written.
-    VideoReport Run(OutputFile& output, Progress& progress);
+    // Pulls the pictures of the trim (from its tick start, seeking the stage there) through
+    // the stage into sink. Throws ToolError when the decoder gave up on damaged input, the
+    // trim starts after the input's end, or a capture could not be written.
+    VideoReport Run(PictureSink& sink, const Trim& trim);
     // Puts the captures in place; called once the main output is in place too, so that a
     // failed run leaves none of its files behind.
-    void CommitCaptures();
+    void CommitCaptures() { captures_.Commit(); }
 
 private:
     void CheckCrop() const;
     void SetWatermarks(const Bitmap32* watermark, const Bitmap32* userWatermark);
-    void CaptureDue(double seconds, bool atEnd, VideoReport& report);
+    long long SeekTo(double start);
+    void Capture(double seconds, bool atEnd, VideoReport& report);
 
     VideoDecoder& Turned(VideoSource& source);
 
@@ -64,9 +81,8 @@ private:
     std::unique_ptr<VideoDecoder> turned_;  // between the decoder and the tally, when turning
     std::unique_ptr<VideoTally> tally_;
     VideoStagePtr stage_;
-    // One staged file per capture, made up front so that an impossible name fails at once.
-    std::vector<std::unique_ptr<StagedPath>> captureFiles_;
-    std::vector<bool> captured_;
+    TimedLook look_;
+    CaptureSchedule captures_;
 };
 
 }  // namespace avpost::tool

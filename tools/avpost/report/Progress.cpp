@@ -47,11 +47,17 @@ std::string Progress::Line(double seconds, long long pictures, double elapsed) c
 {
     std::string line = what_ + "  " + Seconds(seconds);
     if (totalSeconds_ > 0.0)
-        line += " of " + Seconds(totalSeconds_);
+        line += " of " + Seconds(totalSeconds_) + " (" +
+                std::to_string(std::lround(100.0 * std::min(seconds / totalSeconds_, 1.0))) + " %)";
     if (pictures > 0) {
         line += "  " + std::to_string(pictures) + " pictures";
         if (elapsed > 0.0)
             line += "  " + std::to_string(std::lround(pictures / elapsed)) + " pictures/s";
+    }
+    if (elapsed > 0.0) {
+        char speed[32];
+        std::snprintf(speed, sizeof(speed), "  %.1fx", seconds / elapsed);
+        line += speed;
     }
     if (totalSeconds_ > 0.0 && seconds > 0.0 && elapsed > 0.0) {
         const double left = elapsed * std::max(totalSeconds_ - seconds, 0.0) / seconds;
@@ -82,6 +88,13 @@ void Progress::Finish()
     std::fprintf(terminal_, "\r%*s\r", static_cast<int>(drawnWidth_), "");
     std::fflush(terminal_);
     drawnWidth_ = 0;
+}
+
+double SpanSeconds(double totalSeconds, const Trim& trim)
+{
+    if (!(totalSeconds > 0.0))
+        return std::isfinite(trim.duration) ? trim.duration : 0.0;
+    return std::max(0.0, std::min(totalSeconds - trim.start, trim.duration));
 }
 
 }  // namespace avpost::tool

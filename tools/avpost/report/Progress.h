@@ -5,14 +5,17 @@
 #include <cstdio>
 #include <string>
 
+#include "tools/avpost/cli/Settings.h"
+
 namespace avpost::tool {
 
-// The line a long run keeps rewriting on standard error: position, pictures per second and
-// the time left, e.g. "video  12.3 s of 60.0 s  310 pictures  52 pictures/s  about 0:45 left".
-// Silent unless standard error is a terminal and --quiet was not given.
+// The line a long run keeps rewriting on standard error: position, pictures per second, speed
+// against real time and the time left, e.g. "video  12.3 s of 60.0 s (21 %)  310 pictures
+// 52 pictures/s  2.1x  about 0:23 left". Silent unless standard error is a terminal and
+// --quiet was not given.
 class Progress {
 public:
-    // what: "video" or "audio"; totalSeconds 0 when the length is unknown.
+    // what: "video", "audio" or "convert"; totalSeconds 0 when the length is unknown.
     Progress(const char* what, double totalSeconds, bool enabled, std::FILE* terminal = stderr);
     ~Progress();
 
@@ -38,6 +41,9 @@ private:
     Clock::time_point lastDrawn_;
     size_t drawnWidth_ = 0;
 };
+
+// How long the output of a trim of an input of totalSeconds will be; 0 when unknown.
+double SpanSeconds(double totalSeconds, const Trim& trim);
 
 }  // namespace avpost::tool
 

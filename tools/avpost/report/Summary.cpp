@@ -21,7 +21,7 @@ std::string VideoSummary(const VideoReport& report)
            std::to_string(report.dropped) + " dropped)";
 }
 
-std::string AudioSummary(const AudioReport& report, bool continuous)
+std::string AudioSummary(const AudioReport& report, bool continuous, const char* repair)
 {
     std::string text = FixedText(report.secondsIn, 2) + " s in, " + FixedText(report.secondsOut, 2) + " s out at " +
                        std::to_string(report.sampleRate) + " Hz " + LayoutName(report.layout);
@@ -30,8 +30,22 @@ std::string AudioSummary(const AudioReport& report, bool continuous)
     if (continuous)
         text += " (" + gaps + " filled, " + overlaps + " trimmed)";
     else if (report.gaps > 0.0005 || report.overlaps > 0.0005)
-        text += " (the input has " + gaps + " and " + overlaps + "; --continuous would repair them)";
+        text += " (the input has " + gaps + " and " + overlaps + "; " + repair + " would repair them)";
     return text;
+}
+
+std::vector<std::string> ConvertSummary(const ConvertReport& report)
+{
+    std::vector<std::string> lines;
+    if (report.video)
+        lines.push_back("video: " + VideoSummary(*report.video) + ", " + report.videoEncoder);
+    if (report.audio)
+        lines.push_back("audio: " + AudioSummary(*report.audio, report.gapsFilled, "--gaps fill") + ", " +
+                        report.audioEncoder);
+    const double speed = report.elapsed > 0.0 ? report.seconds / report.elapsed : 0.0;
+    lines.push_back(FixedText(report.seconds, 2) + " s of " + report.container + " in " + FixedText(report.elapsed, 1) +
+                    " s (" + FixedText(speed, 1) + "x real time)");
+    return lines;
 }
 
 }  // namespace avpost::tool

@@ -117,4 +117,11 @@ Bitmap32 LoadWatermarkImage(const std::string& path)
 #endif
 }
 
+std::optional<Bitmap32> LoadWatermarkIfGiven(const std::string& path)
+{
+    if (path.empty())
+        return std::nullopt;
+    return LoadWatermarkImage(path);
+}
+
 }  // namespace avpost::tool

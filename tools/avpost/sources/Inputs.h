@@ -2,6 +2,7 @@
 #define AVPOST_TOOLS_AVPOST_SOURCES_INPUTS_H
 
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "tools/avpost/formats/Bmp.h"
@@ -22,6 +23,8 @@ std::string InputName(const std::string& path);
 // Reads a watermark image: BMP of 24 or 32 bits by the tool itself, anything else through
 // FFmpeg when the tool has it. Throws ToolError naming the file and the problem.
 Bitmap32 LoadWatermarkImage(const std::string& path);
+// The image when a path is given (not empty).
+std::optional<Bitmap32> LoadWatermarkIfGiven(const std::string& path);
 
 }  // namespace avpost::tool
 

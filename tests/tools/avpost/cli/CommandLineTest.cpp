@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -37,9 +38,9 @@ TEST(CommandLine, VideoOptionsReachTheirSettings)
     EXPECT_TRUE(v.keepLastFrame);
     EXPECT_EQ(std::tie(v.hasCrop, v.crop.left, v.crop.top, v.crop.right, v.crop.bottom),
               std::make_tuple(true, 8, 4, 648, 364));
-    EXPECT_EQ(std::tie(v.brightness, v.contrast, v.saturation), std::make_tuple(-20, 15, 100));
-    EXPECT_EQ(std::tie(v.filters, v.flips, v.deinterlace),
-              std::make_tuple(kFilterSepia | kFilterGray, 3u, DEINTERLACE_ODD_INTERPOLATE));
+    EXPECT_EQ(std::tie(v.brightness.base, v.contrast.base, v.saturation.base), std::make_tuple(-20, 15, 100));
+    EXPECT_EQ(std::tie(v.filters.base, v.flips, v.deinterlace),
+              std::make_tuple(int{kFilterSepia | kFilterGray}, 3u, DEINTERLACE_ODD_INTERPOLATE));
     EXPECT_EQ(std::tie(v.watermark.image, v.watermark.align, v.watermark.hasRect, v.watermark.level),
               std::make_tuple("logo.bmp", 9, false, 0));
     const tagFRECT& user = v.userWatermark.rect;
@@ -71,6 +72,45 @@ TEST(CommandLine, AudioOptionsDefaultsAndPlainWords)
     EXPECT_EQ(Parse({"video", "--watermark-pos", "10:20:30:40", "a", "b"}).video.watermark.rect.right, 40);
 }
 
+TEST(CommandLine, ConvertTakesEncodingTrimmingAndTimedSettings)
+{
+    const Invocation call = Parse({"convert", "talk.mov", "talk.mp4", "--size", "1280x720", "--volume", "80", "-f",
+                                   "matroska", "-c:v", "libx265", "--audio-codec", "libopus", "--crf", "18.5",
+                                   "--preset", "veryfast", "-b:v", "2.5M", "--audio-bitrate", "96k", "--threads", "3",
+                                   "-an", "--start", "1:30", "--duration", "20.5", "--json", "run.json", "--gaps",
+                                   "close", "--thumbnails", "2.5=shots/t%03d-%%.jpg"});
+    EXPECT_EQ(std::tie(call.command, call.video.width, call.audio.volume, call.audio.continuous),
+              std::make_tuple(Command::Convert, 1280, 80, false));
+    const EncodeSettings& e = call.encode;
+    EXPECT_EQ(std::tie(e.format, e.videoCodec, e.audioCodec, e.crf, e.preset, e.videoBitRate, e.audioBitRate,
+                       e.threads, e.video, e.audio, e.json),
+              std::make_tuple("matroska", "libx265", "libopus", 18.5, "veryfast", int64_t{2500000}, int64_t{96000}, 3,
+                              true, false, "run.json"));
+    EXPECT_EQ(std::tie(call.trim.start, call.trim.duration), std::make_tuple(90.0, 20.5));
+    EXPECT_EQ(std::tie(call.video.thumbnails.every, call.video.thumbnails.pattern, call.video.thumbnails.jpeg),
+              std::make_tuple(2.5, "shots/t%03d-%%.jpg", true));
+    // Convert's defaults: gapless sound, the encoders' own settings, the whole input.
+    const Invocation plain = Parse({"convert", "a", "b"});
+    EXPECT_EQ(std::tie(plain.audio.continuous, plain.encode.crf, plain.encode.threads, plain.trim.start),
+              std::make_tuple(true, -1.0, 0, 0.0));
+    EXPECT_FALSE(std::isfinite(plain.trim.duration));
+
+    // Timed items: plain ones make the value outside the stretches (for filters, all of them).
+    const VideoSettings timed =
+        Parse({"video", "a", "b", "--brightness", "10,-40@3-4.5,20@1:00-", "--filter", "gray,sepia@3-4,emboss@0:01-2"})
+            .video;
+    EXPECT_EQ(timed.brightness.base, 10);
+    ASSERT_EQ(timed.brightness.stretches.size(), 2u);
+    const TimedValue& dim = timed.brightness.stretches[0];
+    EXPECT_EQ(std::tie(dim.value, dim.range.from, dim.range.until), std::make_tuple(-40, 3.0, 4.5));
+    EXPECT_EQ(timed.brightness.stretches[1].range.from, 60.0);
+    EXPECT_FALSE(std::isfinite(timed.brightness.stretches[1].range.until));
+    EXPECT_EQ(timed.filters.base, int{kFilterGray});
+    ASSERT_EQ(timed.filters.stretches.size(), 2u);
+    EXPECT_EQ(std::tie(timed.filters.stretches[1].value, timed.filters.stretches[1].range.from),
+              std::make_tuple(int{kFilterEmboss}, 1.0));
+}
+
 TEST(CommandLine, HelpNeedsNothingElse)
 {
     EXPECT_EQ(Parse({}).command, Command::Usage);
@@ -87,7 +127,28 @@ TEST(CommandLine, BadInputIsNamedWithWhatWasExpected)
         std::vector<std::string> args;
         const char* error;
     } cases[] = {
-        {{"convert"}, "convert: unknown command"},
+        {{"encode"}, "encode: unknown command"},
+        {{"convert", "a"}, "avpost convert: needs an OUTPUT after the INPUT"},
+        {{"video", "a", "b", "--crf", "20"}, "--crf: is an option of 'avpost convert'"},
+        {{"audio", "a", "b", "--thumbnails", "5=t%d.jpg"}, "--thumbnails: is an option of 'avpost video' and 'avpost convert'"},
+        {{"convert", "a", "b", "--continuous"}, "--continuous: is an option of 'avpost audio'"},
+        {{"convert", "a", "b", "--brightness", "10@4-3"}, "--brightness: expected FROM-UNTIL"},
+        {{"convert", "a", "b", "--brightness", "101@1-2"}, "--brightness: expected a whole number from -100 to 100"},
+        {{"convert", "a", "b", "--filter", "sepia@"}, "--filter: expected FROM-UNTIL"},
+        {{"convert", "a", "b", "--filter", "blur@1-2"}, "--filter: expected a comma-separated list of gray"},
+        {{"convert", "a", "b", "--thumbnails", "10=thumb.jpg"}, "--thumbnails: expected SECONDS=PATTERN"},
+        {{"convert", "a", "b", "--thumbnails", "10=t%d%d.jpg"}, "--thumbnails: expected SECONDS=PATTERN"},
+        {{"convert", "a", "b", "--thumbnails", "10=t%s.jpg"}, "--thumbnails: expected SECONDS=PATTERN"},
+        {{"convert", "a", "b", "--thumbnails", "10=t%d.png"}, "--thumbnails: expected SECONDS=PATTERN"},
+        {{"convert", "a", "b", "--thumbnails", "0=t%d.jpg"}, "--thumbnails: expected SECONDS=PATTERN"},
+        {{"convert", "a", "b", "--video-bitrate", "0"}, "--video-bitrate: expected a bit rate"},
+        {{"convert", "a", "b", "--audio-bitrate", "5G"}, "--audio-bitrate: expected a bit rate"},
+        {{"convert", "a", "b", "--video-bitrate", "-2M"}, "--video-bitrate: expected a bit rate"},
+        {{"convert", "a", "b", "--crf", "64"}, "--crf: expected a number from 0 to 63"},
+        {{"convert", "a", "b", "--duration", "0"}, "--duration: expected seconds"},
+        {{"convert", "a", "b", "--start", "-1"}, "--start: expected seconds"},
+        {{"convert", "a", "b", "--threads", "65"}, "--threads: expected a whole number from 0 to 64"},
+        {{"convert", "a", "b", "--gaps", "keep"}, "--gaps: expected fill or close"},
         {{"video", "a"}, "avpost video: needs an OUTPUT after the INPUT"},
         {{"audio"}, "avpost audio: needs an INPUT and an OUTPUT"},
         {{"video", "a", "b", "c"}, "c: unexpected argument"},
@@ -107,7 +168,9 @@ TEST(CommandLine, BadInputIsNamedWithWhatWasExpected)
         {{"video", "a", "b", "--fps", "30/0"}, "--fps: expected a rate"},
         {{"video", "a", "b", "--fps", "nan"}, "--fps: expected a rate"},
         {{"video", "a", "b", "--crop", "10:10:-1:0"}, "--crop: expected W:H:X:Y"},
-        {{"video", "a", "b", "--contrast", "101"}, "--contrast: expected a whole number from -100 to 100, got '101'"},
+        {{"video", "a", "b", "--contrast", "101"},
+         "--contrast: expected a whole number from -100 to 100, each may be limited to a time as "
+         "VALUE@FROM-UNTIL, got '101'"},
         {{"video", "a", "b", "--brightness", "5.5"}, "--brightness: expected a whole number"},
         {{"video", "a", "b", "--filter", "gray,blur"}, "--filter: expected a comma-separated list"},
         {{"video", "a", "b", "--deinterlace", "yes"}, "--deinterlace: expected none, even, odd"},
@@ -134,7 +197,8 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
 {
     const std::string help = HelpText("");
     for (const OptionSpec& spec : OptionTable()) {
-        const std::string topic = (spec.commands & kForVideo) != 0 ? "video" : "audio";
+        const std::string topic =
+            (spec.commands & kForVideo) != 0 ? "video" : (spec.commands & kForAudio) != 0 ? "audio" : "convert";
         const std::string part = (spec.commands & kForDemo) != 0 ? help : HelpText(topic);
         EXPECT_NE(part.find(std::string(spec.name) + " "), std::string::npos) << spec.name;
         if (spec.defaultValue != nullptr) {
@@ -145,7 +209,7 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
         for (const Choice& choice : spec.choices)
             EXPECT_NE(part.find(choice.name), std::string::npos) << spec.name << " " << choice.name;
     }
-    for (const char* topic : {"demo", "video", "audio"}) {
+    for (const char* topic : {"demo", "video", "audio", "convert"}) {
         EXPECT_NE(help.find(HelpText(topic)), std::string::npos) << topic;  // the whole help holds each topic's
         ASSERT_FALSE(HelpExamples(topic).empty()) << topic;
         for (const HelpExample& example : HelpExamples(topic)) {
@@ -157,6 +221,26 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
     }
     for (size_t at = 0, end; (end = help.find('\n', at)) != std::string::npos; at = end + 1)
         EXPECT_LE(end - at, 80u) << help.substr(at, end - at);
+}
+
+TEST(CommandLine, TheReadmesToolCommandsAreWhatTheToolTakes)
+{
+    const std::string readme = testing::ReadWholeFile(AVPOST_README);
+    const size_t section = readme.find("## The avpost tool");
+    ASSERT_NE(section, std::string::npos);
+    const std::string text = readme.substr(section, readme.find("\n## ", section + 1) - section);
+    int commands = 0;
+    bool inCode = false;
+    for (size_t at = 0, end; (end = text.find('\n', at)) != std::string::npos; at = end + 1) {
+        const std::string line = text.substr(at, end - at);
+        inCode = line.rfind("```", 0) == 0 ? !inCode : inCode;
+        if (!inCode || line.rfind("avpost ", 0) != 0)
+            continue;
+        const std::vector<std::string> words = Split(line.substr(7, line.find(" |") - 7), ' ');
+        EXPECT_NO_THROW(Parse(words)) << line;
+        commands += words[0] == "convert" ? 1 : 0;
+    }
+    EXPECT_GE(commands, 2);
 }
 
 }  // namespace
