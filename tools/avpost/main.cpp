@@ -11,7 +11,6 @@
 #include "tools/avpost/common/Interruption.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/jobs/Commands.h"
-#include "tools/avpost/output/StandardOutput.h"
 
 namespace {
 
@@ -21,7 +20,7 @@ constexpr int kSignalBase = 128;
 
 int Fail(const char* message)
 {
-    std::fflush(avpost::tool::ResultStream());
+    std::fflush(stdout);
     std::fprintf(stderr, "avpost: %s\n", message);
     return kFailed;
 }
@@ -79,7 +78,7 @@ int main(int argc, char** argv)
     }
     try {
         const int status = Execute(call);
-        if (std::fflush(avpost::tool::ResultStream()) != 0)
+        if (std::fflush(stdout) != 0)
             return errno == EPIPE ? Stopped(SIGPIPE) : Fail("standard output: write error");
         return status;
     } catch (const avpost::tool::Interrupted& interrupted) {

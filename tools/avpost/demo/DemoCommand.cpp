@@ -14,7 +14,7 @@
 #include "tools/avpost/jobs/FileSinks.h"
 #include "tools/avpost/jobs/VideoJob.h"
 #include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
+#include "tools/avpost/output/LibraryTraces.h"
 #include "tools/avpost/report/Progress.h"
 #include "tools/avpost/report/Summary.h"
 
@@ -136,13 +136,13 @@ void RunDemoCommand(const Invocation& call)
 {
     const auto started = std::chrono::steady_clock::now();
     MakeFolders(call.output);
-    DivertLibraryOutput();
+    SilenceLibraryTraces();
     const bool showProgress = !call.quiet && Progress::IsTerminal(stderr);
     const VideoReport video = RunDemoVideo(call.output, showProgress);
     const AudioReport audio = RunDemoAudio(call.output, showProgress);
     const double elapsed = std::chrono::duration<double>(std::chrono::steady_clock::now() - started).count();
     if (!call.quiet)
-        PrintSummary(ResultStream(), call.output, video, audio, elapsed);
+        PrintSummary(stdout, call.output, video, audio, elapsed);
 }
 
 }  // namespace avpost::tool

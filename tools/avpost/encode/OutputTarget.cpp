@@ -7,7 +7,6 @@
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/ffmpeg/FfmpegInput.h"
 #include "tools/avpost/formats/InputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
 
 namespace avpost::tool {
 
@@ -27,8 +26,8 @@ OutputTarget::OutputTarget(const std::string& path)
     std::string url;
     if (IsStandardStream(path)) {
         name_ = "standard output";
-        std::fflush(ResultStream());
-        url = "pipe:" + std::to_string(fileno(ResultStream()));
+        std::fflush(stdout);
+        url = "pipe:" + std::to_string(fileno(stdout));
     } else {
         name_ = path;
         // Devices and pipes cannot be replaced by a finished file: they are written directly.

@@ -12,7 +12,7 @@
 #include "tools/avpost/jobs/FileSinks.h"
 #include "tools/avpost/jobs/VideoJob.h"
 #include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
+#include "tools/avpost/output/LibraryTraces.h"
 #include "tools/avpost/report/Progress.h"
 #include "tools/avpost/report/Summary.h"
 #include "tools/avpost/sources/Inputs.h"
@@ -64,7 +64,7 @@ void RunVideoCommand(const Invocation& call)
     const std::optional<Bitmap32> watermark = LoadWatermarkIfGiven(call.video.watermark.image);
     const std::optional<Bitmap32> userWatermark = LoadWatermarkIfGiven(call.video.userWatermark.image);
 
-    DivertLibraryOutput();
+    SilenceLibraryTraces();
     VideoJob job(*source, InputName(call.input), call.video, watermark ? &*watermark : nullptr,
                  userWatermark ? &*userWatermark : nullptr);
     OutputFile output(call.output);
@@ -83,7 +83,7 @@ void RunAudioCommand(const Invocation& call)
     CheckOutputName(call.output, ".wav", "WAV audio");
     std::unique_ptr<AudioSource> source = OpenAudioInput(call.input);
 
-    DivertLibraryOutput();
+    SilenceLibraryTraces();
     AudioJob job(*source, InputName(call.input), call.audio);
     OutputFile output(call.output);
     Progress progress("audio", SpanSeconds(source->TotalSeconds(), call.trim),

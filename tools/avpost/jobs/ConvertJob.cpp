@@ -10,7 +10,7 @@
 #include "tools/avpost/formats/InputFile.h"
 #include "tools/avpost/jobs/Commands.h"
 #include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
+#include "tools/avpost/output/LibraryTraces.h"
 #include "tools/avpost/report/JsonReport.h"
 #include "tools/avpost/report/Progress.h"
 #include "tools/avpost/sources/Inputs.h"
@@ -71,7 +71,7 @@ ConvertJob::ConvertJob(const Invocation& call)
         notes_.push_back(output + " (" + plan_.container->name + ") holds no sound; only the pictures are written");
     watermark_ = LoadWatermarkIfGiven(call.video.watermark.image);
     userWatermark_ = LoadWatermarkIfGiven(call.video.userWatermark.image);
-    DivertLibraryOutput();
+    SilenceLibraryTraces();
     soundTrim_ = call.trim;
     if (reader_->hasVideo())
         PrepareVideo();

@@ -12,7 +12,6 @@
 #include "tools/avpost/common/Interruption.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/formats/InputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
 
 namespace avpost::tool {
 namespace {
@@ -88,7 +87,7 @@ bool IsDevice(const std::string& path)
 OutputFile::OutputFile(const std::string& path)
 {
     if (IsStandardStream(path)) {
-        file_ = ResultStream();
+        file_ = stdout;
         name_ = "standard output";
         return;
     }
