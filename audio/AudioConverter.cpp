@@ -65,7 +65,7 @@ int64_t CAudioConverter::OutputCount(int64_t mixed) const
         return mixed;
     const double ratio = static_cast<double>(inputRate) / outputRate;
     // A remainder left by another converter can make this negative; nothing is produced then.
-    int64_t m = std::max<int64_t>(0, TruncSaturate<int64_t>((mixed + s_dSpare) / ratio + 0.5));
+    int64_t m = std::max<int64_t>(0, TruncSaturate<int64_t>((static_cast<double>(mixed) + s_dSpare) / ratio + 0.5));
     if (outputChannels > 1)
         m -= m % outputChannels;
     return m;

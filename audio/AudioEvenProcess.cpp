@@ -266,8 +266,8 @@ MEDIA_FRAME* AudioEvenProcess::Stamp(int64_t bytesPerSecond)
 {
     frame.startTime = TruncSaturate<int64_t>(offset * kUnitsPerSecond + 0.5);
     frame.streamTime = frame.startTime;
-    frame.duration = TruncSaturate<int32_t>(0.5 + kUnitsPerSecond * frame.dataSize / bytesPerSecond);
-    offset += static_cast<double>(frame.dataSize) / bytesPerSecond;
+    frame.duration = TruncSaturate<int32_t>(0.5 + kUnitsPerSecond * frame.dataSize / static_cast<double>(bytesPerSecond));
+    offset += static_cast<double>(frame.dataSize) / static_cast<double>(bytesPerSecond);
     bytesOut += frame.dataSize;
     return &frame;
 }

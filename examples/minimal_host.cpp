@@ -21,7 +21,7 @@ public:
     int SetExDecodeParam(unsigned, unsigned, unsigned) override { return 0; }
     const STREAM_INFO* GetStreamInfo() const override { return &info_; }
     double Seek(double, unsigned) override { return 0.0; }
-    double GetOffset() const override { return picture_->streamTime / 1e7; }
+    double GetOffset() const override { return static_cast<double>(picture_->streamTime) / 1e7; }
     MEDIA_FRAME* GetFrame() const override { return picture_; }
     int Forward(int count) override
     {
@@ -59,7 +59,7 @@ int main()
     int pictures = 0;
     do {
         const MEDIA_FRAME* picture = stage->GetFrame();
-        std::printf("%6.3f s  %dx%d  grey level %d\n", picture->startTime / 1e7, picture->width, picture->height,
+        std::printf("%6.3f s  %dx%d  grey level %d\n", static_cast<double>(picture->startTime) / 1e7, picture->width, picture->height,
                     picture->plane[0][picture->width * picture->height / 2]);
         ++pictures;
     } while (stage->Forward(1) >= 1);

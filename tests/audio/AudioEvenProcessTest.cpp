@@ -58,7 +58,7 @@ TEST_F(EvenStage, GapIsFilledInPiecesWithTheLastSampleFrameOnAContiguousTimeLine
         const MEDIA_FRAME& filler = Pull(stage);
         EXPECT_EQ(filler.dataSize, i < 7 ? 2048 : 3304);
         EXPECT_TRUE(Repeats(filler, filler.dataSize, &source.blocks[0].second[176396], 4)) << i;
-        EXPECT_NEAR(filler.startTime, start, 1) << i;
+        EXPECT_NEAR(static_cast<double>(filler.startTime), static_cast<double>(start), 1) << i;
         EXPECT_EQ(filler.streamTime, filler.startTime);
         start = filler.startTime + filler.duration;
     }

@@ -1,6 +1,7 @@
 #ifndef AVPOST_TESTS_SUPPORT_SCRIPTEDAUDIODECODER_H
 #define AVPOST_TESTS_SUPPORT_SCRIPTEDAUDIODECODER_H
 
+#include <cmath>
 #include <cstdint>
 #include <utility>
 #include <vector>
@@ -46,8 +47,9 @@ public:
     double Seek(double seconds) override
     {
         seekRequests.push_back(seconds);
-        const int64_t target = static_cast<int64_t>(seconds * 10000000.0 + 0.5) + info.firstTime;
-        for (next = 0; next < blocks.size() && blocks[next].first.startTime < target;)
+        // In doubles, so that any first time and request compare without overflow.
+        const double target = std::trunc(seconds * 10000000.0 + 0.5) + static_cast<double>(info.firstTime);
+        for (next = 0; next < blocks.size() && static_cast<double>(blocks[next].first.startTime) < target;)
             ++next;
         return seekReaches >= 0.0 ? seekReaches : seconds;
     }

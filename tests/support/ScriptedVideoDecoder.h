@@ -41,12 +41,12 @@ public:
         lastSeekRequest = seconds;
         lastSeekFlags = flags;
         size_t i = 0;
-        while (i + 1 < times_.size() && times_[i] < seconds * 10000000.0 + info_.firstTime)
+        while (i + 1 < times_.size() && static_cast<double>(times_[i]) < seconds * 10000000.0 + static_cast<double>(info_.firstTime))
             ++i;
         Show(i);
         return GetOffset();
     }
-    double GetOffset() const override { return showing_ ? times_[index_] / 10000000.0 : 0.0; }
+    double GetOffset() const override { return showing_ ? static_cast<double>(times_[index_]) / 10000000.0 : 0.0; }
     MEDIA_FRAME* GetFrame() const override { return showing_ ? picture_ : nullptr; }
     int Forward(int count) override
     {

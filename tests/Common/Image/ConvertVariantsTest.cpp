@@ -193,6 +193,6 @@ const Member kMembers[] = {
 };
 
 INSTANTIATE_TEST_SUITE_P(Members, ConverterVariants, ::testing::ValuesIn(kMembers),
-                         [](const auto& info) { return std::string(info.param.name); });
+                         [](const auto& test) { return std::string(test.param.name); });
 
 }  // namespace

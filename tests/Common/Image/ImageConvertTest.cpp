@@ -29,8 +29,9 @@ const auto kByName = [](const auto& info) { return std::string(info.param.name);
 // Rows of `width` used bytes, `pitch` apart, between margins. Everything starts as F, so a write
 // outside the used bytes (margins or row padding) shows up in GuardsIntact().
 struct GuardedPlane {
-    GuardedPlane(int width, int rows, int pitch)
-        : width(width), pitch(pitch), rows(rows), buffer(2 * kMargin + static_cast<size_t>(pitch) * rows, F) {}
+    GuardedPlane(int usedWidth, int rowCount, int rowPitch)
+        : width(usedWidth), pitch(rowPitch), rows(rowCount),
+          buffer(2 * kMargin + static_cast<size_t>(rowPitch) * static_cast<size_t>(rowCount), F) {}
     unsigned char* Data() { return buffer.data() + kMargin; }
     unsigned char& At(int x, int y) { return Data()[y * pitch + x]; }
     bool GuardsIntact() const
@@ -66,8 +67,10 @@ struct Yuv420Planes {
 
 // A bitmap of 3 or 4 bytes per pixel (24-bit rows padded to four bytes) addressed by picture row.
 struct Bitmap : GuardedPlane {
-    Bitmap(int w, int h, int bytes, bool bottomUp)
-        : GuardedPlane(w * bytes, h, bytes == 3 ? (w * 3 + 3) & ~3 : w * 4), bytes(bytes), bottomUp(bottomUp) {}
+    Bitmap(int w, int h, int pixelBytes, bool upsideDown)
+        : GuardedPlane(w * pixelBytes, h, pixelBytes == 3 ? (w * 3 + 3) & ~3 : w * 4),
+          bytes(pixelBytes),
+          bottomUp(upsideDown) {}
     unsigned char* Pixel(int x, int row) { return &At(x * bytes, bottomUp ? rows - 1 - row : row); }
     int bytes;
     bool bottomUp;
@@ -271,7 +274,7 @@ TEST_P(PackedFormats, PlanarToPacked)
     for (int i = 0; i < 12; ++i)
         src.y.At(i % 4, i / 4) = static_cast<unsigned char>(i + 1);
     for (int i = 0; i < 4; ++i)
-        src.u.At(i % 2, i / 2) = static_cast<unsigned char>(90 + i), src.v.At(i % 2, i / 2) = 240 - i;
+        src.u.At(i % 2, i / 2) = static_cast<unsigned char>(90 + i), src.v.At(i % 2, i / 2) = static_cast<unsigned char>(240 - i);
     GuardedPlane dst = Packed(3, {{}, {}, {}, {}});
     Yuv420_2_YUY2(dst.Data(), dst.pitch, 1, 0, 4, 3, f, PLANES(src), 0, 0);
     ExpectRows(dst, {InOrder(f, {F, F, 1, 240, 2, 90, 3, 239, 4, 91, F, F}),
@@ -301,7 +304,7 @@ TEST_P(PackedFormats, RgbToPackedAndBack)
 }
 
 INSTANTIATE_TEST_SUITE_P(Formats, PackedFormats, ::testing::Values(kYUY2, kUYVY),
-                         [](const auto& info) { return std::string(info.param ? "YUY2" : "UYVY"); });
+                         [](const auto& test) { return std::string(test.param ? "YUY2" : "UYVY"); });
 
 // Chroma starts at the rounded-up column and the halved row and covers the samples under the luma
 // rectangle in both pictures.
@@ -311,7 +314,7 @@ TEST(PlanarCopy, ChromaStartsAtTheRoundedUpColumnAndTheHalvedRow)
     for (int i = 0; i < 64; ++i)
         src.y.At(i % 8, i / 8) = static_cast<unsigned char>(i);
     for (int i = 0; i < 16; ++i)
-        src.u.At(i % 4, i / 4) = static_cast<unsigned char>(100 + i), src.v.At(i % 4, i / 4) = 200 + i;
+        src.u.At(i % 4, i / 4) = static_cast<unsigned char>(100 + i), src.v.At(i % 4, i / 4) = static_cast<unsigned char>(200 + i);
     YV12_Blt_fast(PLANES(dst), 0, 0, 3, 3, PLANES(src), 3, 4);
     ExpectRows(dst.y, {{35, 36, 37, F}, {43, 44, 45, F}, {51, 52, 53, F}});
     ExpectRows(dst.u, {{110, F}, {114, F}});

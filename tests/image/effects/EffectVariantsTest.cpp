@@ -219,7 +219,7 @@ const Effect kEffects[] = {
 };
 
 INSTANTIATE_TEST_SUITE_P(Effects, InPlaceEffectVariants, ::testing::ValuesIn(kEffects),
-                         [](const auto& info) { return std::string(info.param.name); });
+                         [](const auto& test) { return std::string(test.param.name); });
 
 // Watermarks of other sizes than the frame, at positions that vary with the seed (partly outside
 // the frame, odd and even), through both blending paths, at levels that include the extremes.

@@ -76,8 +76,9 @@ std::vector<Samples> After(const std::function<void(MEDIA_FRAME*)>& effect, int 
 
 // A 2 x 4 picture with every luma sample y and chroma sample c, in rows of pitches 3, 2 and 3
 // whose padding holds 7, which any adjustment would change.
-std::vector<std::vector<unsigned char>> Planes(unsigned char y, unsigned char c)
+std::vector<std::vector<unsigned char>> Planes(int luma, int chroma)
 {
+    const auto y = static_cast<unsigned char>(luma), c = static_cast<unsigned char>(chroma);
     return {{y, y, 7, y, y, 7, y, y, 7, y, y, 7}, {c, 7, c, 7}, {c, 7, 7, c, 7, 7}};
 }
 

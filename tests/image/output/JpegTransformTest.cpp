@@ -69,7 +69,7 @@ std::vector<float> EncoderLikeDivisors(std::mt19937& random)
                                  1.0,         0.785694958, 0.541196100, 0.275899379};
     std::vector<float> divisors(64);
     for (int i = 0; i < 64; ++i)
-        divisors[i] = static_cast<float>(1.0 / ((5 + random() % 46) * scale[i / 8] * scale[i % 8] * 8.0));
+        divisors[i] = static_cast<float>(1.0 / (static_cast<double>(5 + random() % 46) * scale[i / 8] * scale[i % 8] * 8.0));
     return divisors;
 }
 

@@ -146,7 +146,7 @@ TEST(ResizeVariants, RandomPicturesAndRectangles)
         for (int n = 0; n < 250; ++n) {
             const Geometry from = RandomGeometry(random, 90, 40, 1);
             const Geometry to = RandomGeometry(random, 90, 40, c.smallestDestination);
-            if (!SameAtEveryLevel(c, from, to, random()))
+            if (!SameAtEveryLevel(c, from, to, static_cast<unsigned>(random())))
                 break;
         }
     }

@@ -206,7 +206,8 @@ TEST_F(Convert, EveryBeepStaysWithinOnePictureOfItsFlash)
                 for (size_t i = 0; i < beeps.size(); ++i)
                     EXPECT_NEAR(beeps[i], flashes[i + (lateStart ? 1 : 0)], 1.0 / 25) << "beep " << i;
                 // Sound and pictures start together and end within a picture.
-                EXPECT_NEAR(decoded.pictures.size() / 25.0, decoded.samples.size() / double{kSampleRate}, 1.0 / 25);
+                EXPECT_NEAR(static_cast<double>(decoded.pictures.size()) / 25.0,
+                            static_cast<double>(decoded.samples.size()) / kSampleRate, 1.0 / 25);
             }
         }
     }
@@ -245,7 +246,8 @@ TEST_F(Convert, TrimsStartOnTheTickNearestTheStartAndLastTheirDuration)
         // The sound starts on the same tick, to the sample, and lasts as long as the pictures.
         ASSERT_FALSE(decoded.samples.empty());
         EXPECT_NEAR(decoded.samples[0], c.start / 8 * 32767, 1.0);
-        EXPECT_NEAR(decoded.samples.size() / double{kSampleRate}, c.pictures / c.frameRate, 0.5 / kSampleRate);
+        EXPECT_NEAR(static_cast<double>(decoded.samples.size()) / kSampleRate, static_cast<double>(c.pictures) / c.frameRate,
+                    0.5 / kSampleRate);
     }
 }
 

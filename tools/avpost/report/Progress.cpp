@@ -52,7 +52,7 @@ std::string Progress::Line(double seconds, long long pictures, double elapsed) c
     if (pictures > 0) {
         line += "  " + std::to_string(pictures) + " pictures";
         if (elapsed > 0.0)
-            line += "  " + std::to_string(std::lround(pictures / elapsed)) + " pictures/s";
+            line += "  " + std::to_string(std::lround(static_cast<double>(pictures) / elapsed)) + " pictures/s";
     }
     if (elapsed > 0.0) {
         char speed[32];

@@ -13,7 +13,7 @@ TEST(StampClock, MillisecondStampsOfEvenFramesBecomeExactWithoutDrift)
     StampClock clock(10000000.0 / 48000, 10000);
     const std::vector<int64_t> stamps = {0, 210000, 430000, 640000, 850000};
     for (size_t i = 0; i < stamps.size(); ++i)
-        EXPECT_EQ(clock.Next(stamps[i], 1024), static_cast<int64_t>(i * 1024 * 10000000.0 / 48000 + 0.5)) << i;
+        EXPECT_EQ(clock.Next(stamps[i], 1024), static_cast<int64_t>(static_cast<double>(i * 1024) * 10000000.0 / 48000 + 0.5)) << i;
 
     // Long runs do not drift.
     StampClock longRun(10000000.0 / 44100, 227);  // one-sample clock of an MP4 audio track
@@ -21,7 +21,7 @@ TEST(StampClock, MillisecondStampsOfEvenFramesBecomeExactWithoutDrift)
     int64_t last = 0;
     for (int block = 0; block < 100000; ++block, samples += 1024)
         last = longRun.Next(samples * 10000000 / 44100, 1024);
-    EXPECT_EQ(last, static_cast<int64_t>((samples - 1024) * 10000000.0 / 44100 + 0.5));
+    EXPECT_EQ(last, static_cast<int64_t>(static_cast<double>(samples - 1024) * 10000000.0 / 44100 + 0.5));
 }
 
 TEST(StampClock, RealJumpsAndMissingStampsAreHandled)
