@@ -13,9 +13,9 @@
 #include <vector>
 
 #include "PeerBench.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "image/output/DibImage.h"
 #include "image/output/JpegEncoder.h"
-#include "tests/support/ScriptedVideoDecoder.h"
 #include "video/VideoProcess.h"
 
 namespace {

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "ToolTestSupport.h"
-#include "support/MediaFiles.h"
+#include "doubles/MediaFiles.h"
 
 namespace avpost::tool {
 namespace {
