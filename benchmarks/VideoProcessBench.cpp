@@ -1,6 +1,6 @@
 #include <benchmark/benchmark.h>
 
-#include "tests/support/ScriptedVideoDecoder.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "video/VideoProcess.h"
 
 namespace {

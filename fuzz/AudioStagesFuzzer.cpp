@@ -8,8 +8,8 @@
 #include "FuzzInput.h"
 #include "FuzzSeeds.h"
 #include "audio/AudioConverter.h"
+#include "doubles/ScriptedAudioDecoder.h"
 #include "media/AudioExports.h"
-#include "support/ScriptedAudioDecoder.h"
 
 namespace {
 

@@ -7,7 +7,7 @@
 
 #include "FuzzSeeds.h"
 #include "ScratchFile.h"
-#include "support/MediaFiles.h"
+#include "doubles/MediaFiles.h"
 #include "image/output/JpegEncoder.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)

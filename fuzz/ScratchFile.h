@@ -9,6 +9,8 @@
 #include <cstdlib>
 #include <string>
 
+#include "support/FileHandle.h"
+
 // A folder of this process for the files a target hands to code that reads files, made on first
 // use and removed at exit.
 class ScratchFolder {
@@ -24,8 +26,9 @@ public:
     std::string Write(const char* name, const uint8_t* data, size_t size) const
     {
         const std::string path = File(name);
-        std::FILE* file = std::fopen(path.c_str(), "wb");
-        if (file == nullptr || (size != 0 && std::fwrite(data, 1, size, file) != size) || std::fclose(file) != 0)
+        auto file = avpost::detail::OpenFile(path.c_str(), "wb");
+        if (!file || (size != 0 && std::fwrite(data, 1, size, file.get()) != size) ||
+            avpost::detail::CloseFile(file) != 0)
             std::abort();
         return path;
     }

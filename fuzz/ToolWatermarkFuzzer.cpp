@@ -6,9 +6,9 @@
 
 #include "FuzzSeeds.h"
 #include "ScratchFile.h"
-#include "support/MediaFiles.h"
+#include "doubles/MediaFiles.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "media/VideoExports.h"
-#include "support/ScriptedVideoDecoder.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/sources/Inputs.h"
 

@@ -10,8 +10,8 @@
 
 #include "FuzzInput.h"
 #include "FuzzSeeds.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "media/VideoExports.h"
-#include "support/ScriptedVideoDecoder.h"
 
 namespace {
 

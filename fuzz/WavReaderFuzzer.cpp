@@ -5,7 +5,7 @@
 
 #include "FuzzSeeds.h"
 #include "ScratchFile.h"
-#include "support/MediaFiles.h"
+#include "doubles/MediaFiles.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/formats/WavAudioDecoder.h"
 

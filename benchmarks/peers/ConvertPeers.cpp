@@ -13,6 +13,7 @@ extern "C" {
 
 #include "Common/Image/ImageConvert.h"
 #include "PeerBench.h"
+#include "doubles/BitmapHeader.h"
 
 namespace {
 
@@ -44,17 +45,6 @@ Pictures& Input()
 {
     static Pictures pictures;
     return pictures;
-}
-
-tagBITMAPINFOHEADER Header(int bitCount)
-{
-    tagBITMAPINFOHEADER header{};
-    header.biSize = sizeof(header);
-    header.biWidth = kWidth;
-    header.biHeight = kHeight;
-    header.biPlanes = 1;
-    header.biBitCount = static_cast<uint16_t>(bitCount);
-    return header;
 }
 
 // One packed picture's rows, the first memory row given last when the picture is bottom-up.
@@ -170,7 +160,7 @@ void AddToPacked(const char* work, const char* by, int bytesPerPixel, Convert co
 void RegisterRgbToYuv()
 {
     AddToPlanar("rgb24_to_i420_bottom_up", peers::kOurs, [](auto y, auto u, auto v, auto) {
-        tagBITMAPINFOHEADER header = Header(24);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 24);
         Rgb24_2_yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, &header, Input().rgb24.data());
     });
     AddToPlanar("rgb24_to_i420_bottom_up", "libyuv", [](auto y, auto u, auto v, auto) {
@@ -180,7 +170,7 @@ void RegisterRgbToYuv()
     AddPackedToPlanar("rgb24_to_i420_bottom_up", AV_PIX_FMT_BGR24, &Pictures::rgb24, 3, true);
 
     AddToPlanar("rgb32_to_i420_bottom_up", peers::kOurs, [](auto y, auto u, auto v, auto) {
-        tagBITMAPINFOHEADER header = Header(32);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 32);
         Rgb32_2_yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, &header, Input().rgb32.data());
     });
     AddToPlanar("rgb32_to_i420_bottom_up", "libyuv", [](auto y, auto u, auto v, auto) {
@@ -191,7 +181,7 @@ void RegisterRgbToYuv()
 
     // The watermark setters' conversion: top-down, with the alpha plane.
     AddToPlanar("rgb32_to_i420_alpha", peers::kOurs, [](auto y, auto u, auto v, auto a) {
-        tagBITMAPINFOHEADER header = Header(32);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 32);
         Rgb32_2_yuv420A(y, u, v, a, kWidth, kChromaWidth, kChromaWidth, &header, Input().rgb32.data(), 0);
     });
     AddToPlanar("rgb32_to_i420_alpha", "libyuv", [](auto y, auto u, auto v, auto a) {
@@ -206,7 +196,7 @@ void RegisterYuvToRgb()
 {
     Pictures& in = Input();
     AddToPacked("i420_to_rgb24_bottom_up", peers::kOurs, 3, [&in](unsigned char* bits) {
-        tagBITMAPINFOHEADER header = Header(24);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 24);
         Yuv420_2_rgb24(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_rgb24_bottom_up", "libyuv", 3, [&in](unsigned char* bits) {
@@ -216,7 +206,7 @@ void RegisterYuvToRgb()
     AddPlanarToPacked("i420_to_rgb24_bottom_up", AV_PIX_FMT_BGR24, 3, true);
 
     AddToPacked("i420_to_rgb32_bottom_up", peers::kOurs, 4, [&in](unsigned char* bits) {
-        tagBITMAPINFOHEADER header = Header(32);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 32);
         Yuv420_2_rgb32(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_rgb32_bottom_up", "libyuv", 4, [&in](unsigned char* bits) {
@@ -226,7 +216,7 @@ void RegisterYuvToRgb()
     AddPlanarToPacked("i420_to_rgb32_bottom_up", AV_PIX_FMT_BGRA, 4, true);
 
     AddToPacked("i420_to_argb_top_down", peers::kOurs, 4, [&in](unsigned char* bits) {
-        tagBITMAPINFOHEADER header = Header(32);
+        tagBITMAPINFOHEADER header = BitmapHeader(kWidth, kHeight, 32);
         Yuv420_2_Argb(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_argb_top_down", "libyuv", 4, [&in](unsigned char* bits) {

@@ -13,9 +13,10 @@
 #include <vector>
 
 #include "PeerBench.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "image/output/DibImage.h"
 #include "image/output/JpegEncoder.h"
-#include "tests/support/ScriptedVideoDecoder.h"
+#include "support/FileHandle.h"
 #include "video/VideoProcess.h"
 
 namespace {
@@ -70,25 +71,22 @@ std::string WriteScene(const ScratchDir& dir)
 std::vector<unsigned char> ReadWhole(const std::string& path)
 {
     std::vector<unsigned char> bytes;
-    if (std::FILE* file = std::fopen(path.c_str(), "rb")) {
-        std::fseek(file, 0, SEEK_END);
-        bytes.resize(static_cast<size_t>(std::ftell(file)));
-        std::fseek(file, 0, SEEK_SET);
-        bytes.resize(std::fread(bytes.data(), 1, bytes.size(), file));
-        std::fclose(file);
+    if (const auto file = avpost::detail::OpenFile(path.c_str(), "rb")) {
+        std::fseek(file.get(), 0, SEEK_END);
+        bytes.resize(static_cast<size_t>(std::ftell(file.get())));
+        std::fseek(file.get(), 0, SEEK_SET);
+        bytes.resize(std::fread(bytes.data(), 1, bytes.size(), file.get()));
     }
     return bytes;
 }
 
 long FileSize(const std::string& path)
 {
-    std::FILE* file = std::fopen(path.c_str(), "rb");
-    if (file == nullptr)
+    const auto file = avpost::detail::OpenFile(path.c_str(), "rb");
+    if (!file)
         return -1;
-    std::fseek(file, 0, SEEK_END);
-    const long size = std::ftell(file);
-    std::fclose(file);
-    return size;
+    std::fseek(file.get(), 0, SEEK_END);
+    return std::ftell(file.get());
 }
 
 struct TjDestroy {
@@ -105,10 +103,8 @@ unsigned long CompressToFile(tjhandle compressor, const unsigned char* bgr, int 
     if (tjCompress2(compressor, bgr, kWidth, pitch, kHeight, TJPF_BGR, &jpeg, &size, TJSAMP_444, kQuality, flags) !=
         0)
         return 0;
-    if (std::FILE* file = std::fopen(path.c_str(), "wb")) {
-        std::fwrite(jpeg, 1, size, file);
-        std::fclose(file);
-    }
+    if (const auto file = avpost::detail::OpenFile(path.c_str(), "wb"))
+        std::fwrite(jpeg, 1, size, file.get());
     tjFree(jpeg);
     return size;
 }

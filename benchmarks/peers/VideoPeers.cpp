@@ -9,7 +9,7 @@
 
 #include "PeerBench.h"
 #include "PeerPictures.h"
-#include "tests/support/ScriptedVideoDecoder.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "video/VideoProcess.h"
 
 namespace {

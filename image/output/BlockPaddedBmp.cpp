@@ -8,6 +8,9 @@
 #include <utility>
 #include <vector>
 
+#include "support/FileHandle.h"
+#include "support/LittleEndian.h"
+
 namespace {
 
 constexpr size_t kHeaderSize = 54;
@@ -16,11 +19,6 @@ constexpr int kWidthOffset = 18;
 constexpr int kHeightOffset = 22;
 // Rows are read one at a time, through a buffer large enough that the reads stay few.
 constexpr size_t kReadBuffer = size_t{1} << 17;
-
-struct FileCloser {
-    void operator()(std::FILE* f) const { std::fclose(f); }
-};
-using FilePtr = std::unique_ptr<std::FILE, FileCloser>;
 
 uint32_t RoundUpTo8(uint32_t n) { return (n + 7) & ~uint32_t{7}; }
 
@@ -64,7 +62,7 @@ void RepeatBottomRow(BlockPaddedPicture& picture)
 bool ReadBlockPaddedBmp(const char* path, BlockPaddedPicture& picture)
 {
     std::vector<char> readBuffer(kReadBuffer);  // outlives the file, which uses it
-    FilePtr file(std::fopen(path, "rb"));
+    const auto file = avpost::detail::OpenFile(path, "rb");
     if (!file || std::setvbuf(file.get(), readBuffer.data(), _IOFBF, readBuffer.size()) != 0)
         return false;
     unsigned char header[kHeaderSize];
@@ -73,8 +71,8 @@ bool ReadBlockPaddedBmp(const char* path, BlockPaddedPicture& picture)
         return false;
 
     BlockPaddedPicture read;
-    read.width = header[kWidthOffset] + 256u * header[kWidthOffset + 1];
-    read.height = header[kHeightOffset] + 256u * header[kHeightOffset + 1];
+    read.width = avpost::detail::ReadLe16(header + kWidthOffset);
+    read.height = avpost::detail::ReadLe16(header + kHeightOffset);
     const uint32_t rowBytes = read.width * 3;
     if (!HoldsPixelRows(path, read.height, rowBytes + (4 - rowBytes % 4) % 4))
         return false;

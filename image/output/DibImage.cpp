@@ -8,6 +8,9 @@
 #include <memory>
 #include <new>
 
+#include "support/FileHandle.h"
+#include "support/LittleEndian.h"
+
 namespace {
 
 constexpr uint32_t kInfoHeaderSize = 40;
@@ -32,16 +35,6 @@ uint32_t HeaderSize(const tagBITMAPINFOHEADER& header)
 
 // Rows are padded to whole 32-bit words.
 int64_t RowStride(int width, int bitCount) { return ((int64_t{bitCount} * width + 31) & ~int64_t{31}) / 8; }
-
-void PutLittleEndian(unsigned char* out, uint32_t value, int bytes)
-{
-    for (int i = 0; i < bytes; ++i)
-        out[i] = static_cast<unsigned char>(value >> (8 * i));
-}
-
-struct FileCloser {
-    void operator()(std::FILE* f) const { std::fclose(f); }
-};
 
 struct FreeDeleter {
     void operator()(unsigned char* p) const { std::free(p); }
@@ -103,15 +96,15 @@ int DibImage::Save(const char* path)
 {
     if (bits == nullptr || info == nullptr || path == nullptr)
         return 0;
-    std::unique_ptr<std::FILE, FileCloser> file(std::fopen(path, "wb"));
+    const auto file = avpost::detail::OpenFile(path, "wb");
     if (!file)
         return 0;
     const uint32_t headerSize = HeaderSize(info->bmiHeader);
     const uint32_t imageSize = info->bmiHeader.biSizeImage;
 
     unsigned char fileHeader[kFileHeaderSize] = {'B', 'M'};
-    PutLittleEndian(fileHeader + 2, kFileHeaderSize + headerSize + imageSize, 4);
-    PutLittleEndian(fileHeader + 10, kFileHeaderSize + headerSize, 4);
+    avpost::detail::StoreLe32(fileHeader + 2, kFileHeaderSize + headerSize + imageSize);
+    avpost::detail::StoreLe32(fileHeader + 10, kFileHeaderSize + headerSize);
     std::fwrite(fileHeader, 1, sizeof fileHeader, file.get());
     std::fwrite(info, 1, headerSize, file.get());
     std::fwrite(bits, 1, imageSize, file.get());

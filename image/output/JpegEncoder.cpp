@@ -26,6 +26,7 @@
 #include "image/output/JpegBitWriter.h"
 #include "image/output/JpegColour.h"
 #include "image/output/JpegTransform.h"
+#include "support/FileHandle.h"
 #include "support/TraceLine.h"
 
 namespace {
@@ -482,11 +483,11 @@ void Encoder::EncodeFile(unsigned short pictureWidth, unsigned short pictureHeig
 // device, a pipe) is not ours to remove.
 int WriteWholeFile(const char* path, const unsigned char* bytes, size_t size)
 {
-    std::FILE* file = std::fopen(path, "wb");
-    if (file == nullptr)
+    auto file = avpost::detail::OpenFile(path, "wb");
+    if (!file)
         return EOF;
-    const bool written = std::fwrite(bytes, 1, size, file) == size;
-    const int closed = std::fclose(file);
+    const bool written = std::fwrite(bytes, 1, size, file.get()) == size;
+    const int closed = avpost::detail::CloseFile(file);
     if (written && closed == 0)
         return 0;
     std::error_code error;

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "AudioSamples.h"
-#include "support/EventLog.h"
+#include "doubles/EventLog.h"
 
 namespace {
 

@@ -7,8 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "support/EventLog.h"
-#include "support/ScriptedAudioDecoder.h"
+#include "doubles/EventLog.h"
+#include "doubles/ScriptedAudioDecoder.h"
 
 namespace {
 

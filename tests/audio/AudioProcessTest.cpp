@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "AudioSamples.h"
-#include "support/ScriptedAudioDecoder.h"
+#include "doubles/ScriptedAudioDecoder.h"
 
 namespace {
 

@@ -8,7 +8,7 @@
 
 #include "audio/AudioEvenProcess.h"
 #include "audio/AudioProcess.h"
-#include "support/ScriptedAudioDecoder.h"
+#include "doubles/ScriptedAudioDecoder.h"
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "support/VideoFrames.h"
+#include "doubles/VideoFrames.h"
 
 namespace {
 

@@ -2,8 +2,8 @@
 // kernel's variants fall back to lower levels.
 #include <gtest/gtest.h>
 
+#include "doubles/SimdLevels.h"
 #include "support/CpuFeatures.h"
-#include "support/SimdLevels.h"
 
 namespace {
 

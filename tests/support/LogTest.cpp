@@ -5,7 +5,7 @@
 
 #include <string>
 
-#include "support/EventLog.h"
+#include "doubles/EventLog.h"
 
 namespace {
 

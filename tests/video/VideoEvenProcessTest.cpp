@@ -5,8 +5,8 @@
 #include <cmath>
 #include <vector>
 
+#include "doubles/ScriptedVideoDecoder.h"
 #include "media/VideoExports.h"
-#include "support/ScriptedVideoDecoder.h"
 
 namespace {
 

@@ -6,7 +6,7 @@
 #include <cstdlib>
 #include <new>
 
-#include "support/ScriptedVideoDecoder.h"
+#include "doubles/ScriptedVideoDecoder.h"
 #include "video/VideoProcess.h"
 
 namespace {

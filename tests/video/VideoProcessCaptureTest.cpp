@@ -6,9 +6,9 @@
 #include <string>
 #include <vector>
 
+#include "doubles/ScriptedVideoDecoder.h"
 #include "image/output/OutputTestFiles.h"
 #include "media/VideoExports.h"
-#include "support/ScriptedVideoDecoder.h"
 
 namespace {
 

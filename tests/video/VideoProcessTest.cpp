@@ -5,11 +5,11 @@
 #include <cstring>
 #include <vector>
 
+#include "doubles/ScriptedVideoDecoder.h"
+#include "doubles/VideoFrames.h"
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
 #include "image/resize/YuvFrameResize.h"
-#include "support/ScriptedVideoDecoder.h"
-#include "support/VideoFrames.h"
 #include "video/VideoEvenProcess.h"
 
 namespace {

@@ -5,8 +5,8 @@
 #include <atomic>
 #include <thread>
 
+#include "doubles/ScriptedVideoDecoder.h"
 #include "media/VideoExports.h"
-#include "support/ScriptedVideoDecoder.h"
 
 namespace {
 

@@ -7,10 +7,10 @@
 #include <string>
 #include <vector>
 
+#include "doubles/BitmapHeader.h"
+#include "doubles/ScriptedVideoDecoder.h"
+#include "doubles/VideoFrames.h"
 #include "media/VideoExports.h"
-#include "support/BitmapHeader.h"
-#include "support/ScriptedVideoDecoder.h"
-#include "support/VideoFrames.h"
 
 namespace {
 

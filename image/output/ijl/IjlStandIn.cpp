@@ -13,6 +13,7 @@
 
 #include "image/output/IjlIoCodes.h"
 #include "image/output/JpegCoreProperties.h"
+#include "support/FileHandle.h"
 
 #define IJL_EXPORT extern "C" __attribute__((visibility("default")))
 
@@ -146,11 +147,11 @@ int WriteImage(const JPEG_CORE_PROPERTIES& p)
     if (p.JPGFile == nullptr || p.DIBBytes == nullptr || p.DIBChannels != kChannels || p.JPGWidth == 0 ||
         p.JPGHeight == 0 || p.DIBWidth != p.JPGWidth || PictureHeight(p.DIBHeight) != PictureHeight(p.JPGHeight))
         return kInvalidArgument;
-    std::FILE* file = std::fopen(p.JPGFile, "wb");
-    if (file == nullptr)
+    auto file = avpost::detail::OpenFile(p.JPGFile, "wb");
+    if (!file)
         return kFileError;
-    int result = Compress(p, file);
-    if (std::fclose(file) != 0 && result == kIjlOk)
+    int result = Compress(p, file.get());
+    if (avpost::detail::CloseFile(file) != 0 && result == kIjlOk)
         result = kFileError;
     if (result != kIjlOk)
         std::remove(p.JPGFile);

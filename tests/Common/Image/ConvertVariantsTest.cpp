@@ -6,8 +6,8 @@
 #include <string>
 
 #include "Common/Image/ImageConvert.h"
-#include "support/BitmapHeader.h"
-#include "support/LevelComparison.h"
+#include "doubles/BitmapHeader.h"
+#include "doubles/LevelComparison.h"
 
 namespace {
 

@@ -13,7 +13,7 @@
 #include <utility>
 #include <vector>
 
-#include "support/BitmapHeader.h"
+#include "doubles/BitmapHeader.h"
 
 namespace {
 

@@ -10,11 +10,11 @@
 #include <string>
 #include <vector>
 
+#include "doubles/LevelComparison.h"
 #include "image/effects/Deinterlace.h"
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
 #include "image/effects/WaterMark.h"
-#include "support/LevelComparison.h"
 
 namespace {
 

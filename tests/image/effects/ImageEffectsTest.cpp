@@ -8,12 +8,12 @@
 #include <tuple>
 #include <vector>
 
+#include "doubles/VideoFrames.h"
 #include "image/effects/Deinterlace.h"
 #include "image/effects/ImageAdjust.h"
 #include "image/effects/ImageFilter.h"
 #include "image/effects/WaterMark.h"
 #include "image/effects/WatermarkResize.h"
-#include "support/VideoFrames.h"
 
 namespace {
 

@@ -6,9 +6,9 @@
 
 #include <vector>
 
+#include "doubles/GuardedBuffer.h"
+#include "doubles/SimdLevels.h"
 #include "support/CpuFeatures.h"
-#include "support/GuardedBuffer.h"
-#include "support/SimdLevels.h"
 
 namespace {
 

@@ -7,9 +7,9 @@
 #include <thread>
 
 #include "OutputTestFiles.h"
+#include "doubles/SimdLevels.h"
 #include "image/output/DibImage.h"
 #include "support/CpuFeatures.h"
-#include "support/SimdLevels.h"
 
 namespace {
 

@@ -8,9 +8,9 @@
 #include <random>
 #include <vector>
 
+#include "doubles/GuardedBuffer.h"
+#include "doubles/SimdLevels.h"
 #include "support/CpuFeatures.h"
-#include "support/GuardedBuffer.h"
-#include "support/SimdLevels.h"
 
 namespace {
 

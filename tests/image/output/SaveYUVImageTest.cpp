@@ -3,8 +3,8 @@
 #include <gtest/gtest.h>
 
 #include "Common/Image/ImageConvert.h"
+#include "OutputTestFiles.h"
 #include "image/output/DibImage.h"
-#include "image/output/OutputTestFiles.h"
 
 namespace {
 

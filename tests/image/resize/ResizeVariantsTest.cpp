@@ -10,11 +10,11 @@
 #include <string>
 #include <vector>
 
+#include "doubles/GuardedBuffer.h"
+#include "doubles/SimdLevels.h"
 #include "image/resize/ChromaResizeKernels.h"
 #include "image/resize/DibResizeKernels.h"
 #include "image/resize/LumaResizeKernels.h"
-#include "support/GuardedBuffer.h"
-#include "support/SimdLevels.h"
 
 namespace {
 

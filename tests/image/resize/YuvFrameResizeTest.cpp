@@ -3,8 +3,8 @@
 #include <random>
 #include <vector>
 
+#include "doubles/VideoFrames.h"
 #include "image/resize/YuvFrameResize.h"
-#include "support/VideoFrames.h"
 
 namespace {
 

@@ -7,12 +7,13 @@
 #include <vector>
 
 #include "ToolTestSupport.h"
-#include "support/MediaFiles.h"
+#include "doubles/MediaFiles.h"
 
 namespace avpost::tool {
 namespace {
 
-using testing::Le;
+using testing::Le16;
+using testing::Le32;
 using testing::ReadWholeFile;
 using testing::RunResult;
 using testing::WriteWholeFile;
@@ -25,16 +26,16 @@ std::string Cut(const std::vector<uint8_t>& bytes, size_t count) { return Text(b
 // A BMP header of 24-bit pixels with the given size and pixel-data offset, and no pixels.
 std::string BmpHeader(int32_t width, int32_t height, uint32_t offset)
 {
-    return "BM" + Le(offset + 16, 4) + Le(0, 4) + Le(offset, 4) + Le(40, 4) + Le(static_cast<uint32_t>(width), 4) +
-           Le(static_cast<uint32_t>(height), 4) + Le(1, 2) + Le(24, 2) + std::string(24, '\0');
+    return "BM" + Le32(offset + 16) + Le32(0) + Le32(offset) + Le32(40) + Le32(static_cast<uint32_t>(width)) +
+           Le32(static_cast<uint32_t>(height)) + Le16(1) + Le16(24) + std::string(24, '\0');
 }
 
 // A 16-bit WAV header whose format chunk says channels and rate, and whose data chunk announces
 // dataBytes while `follow` bytes follow.
 std::string WavHeader(uint16_t channels, uint32_t rate, uint32_t dataBytes, size_t follow)
 {
-    return "RIFF" + Le(36 + dataBytes, 4) + "WAVEfmt " + Le(16, 4) + Le(1, 2) + Le(channels, 2) + Le(rate, 4) +
-           Le(rate * channels * 2, 4) + Le(channels * 2u, 2) + Le(16, 2) + "data" + Le(dataBytes, 4) +
+    return "RIFF" + Le32(36 + dataBytes) + "WAVEfmt " + Le32(16) + Le16(1) + Le16(channels) + Le32(rate) +
+           Le32(rate * channels * 2) + Le16(channels * 2u) + Le16(16) + "data" + Le32(dataBytes) +
            std::string(follow, '\x11');
 }
 

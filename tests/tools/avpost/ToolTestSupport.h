@@ -21,6 +21,7 @@
 #include <thread>
 #include <vector>
 
+#include "support/LittleEndian.h"
 #include "tools/avpost/common/ToolError.h"
 
 namespace avpost::tool::testing {
@@ -191,12 +192,18 @@ inline double ProbeSeconds(const std::string& path, const std::string& streamTyp
     return std::atof(Probe(path, streamType, "duration").c_str());
 }
 
-// value as `bytes` little-endian bytes.
-inline std::string Le(uint32_t value, int bytes)
+// value as two or four little-endian bytes.
+inline std::string Le16(uint32_t value)
 {
     std::string out;
-    for (int i = 0; i < bytes; ++i)
-        out += static_cast<char>(value >> (8 * i) & 0xFF);
+    avpost::detail::AppendLe16(out, value);
+    return out;
+}
+
+inline std::string Le32(uint32_t value)
+{
+    std::string out;
+    avpost::detail::AppendLe32(out, value);
     return out;
 }
 

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "support/LittleEndian.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/formats/ByteSource.h"
 #include "tools/avpost/formats/Y4m.h"
@@ -9,16 +10,13 @@
 namespace avpost::tool {
 namespace {
 
+using avpost::detail::ReadLe16;
+using avpost::detail::ReadLe32;
+
 constexpr size_t kFileHeaderBytes = 14;
 constexpr size_t kInfoHeaderBytes = 40;
 constexpr uint32_t kUncompressed = 0;
 constexpr uint32_t kBitFields = 3;
-
-uint32_t Le32(const unsigned char* p)
-{
-    return static_cast<uint32_t>(p[0]) | static_cast<uint32_t>(p[1]) << 8 | static_cast<uint32_t>(p[2]) << 16 |
-           static_cast<uint32_t>(p[3]) << 24;
-}
 
 bool AllTransparent(const Bitmap32& bitmap)
 {
@@ -91,11 +89,11 @@ Bitmap32 ReadBmp(ByteSource& file)
         Fail(path, "not a BMP file");
     if (got < sizeof(header))
         Fail(path, "truncated BMP header");
-    const uint32_t dataOffset = Le32(header + 10);
-    const auto width = static_cast<int32_t>(Le32(header + 18));
-    const auto rawHeight = static_cast<int32_t>(Le32(header + 22));
-    const unsigned bits = header[28] | header[29] << 8;
-    const uint32_t compression = Le32(header + 30);
+    const uint32_t dataOffset = ReadLe32(header + 10);
+    const auto width = static_cast<int32_t>(ReadLe32(header + 18));
+    const auto rawHeight = static_cast<int32_t>(ReadLe32(header + 22));
+    const unsigned bits = ReadLe16(header + 28);
+    const uint32_t compression = ReadLe32(header + 30);
     // Negative heights mark top-down rows; the most negative one has no positive counterpart.
     const int64_t rows = rawHeight < 0 ? -int64_t{rawHeight} : rawHeight;
     if (width <= 0 || rows <= 0 || width > kLargestPictureSide || rows > kLargestPictureSide)

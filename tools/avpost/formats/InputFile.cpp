@@ -17,7 +17,7 @@ InputFile::InputFile(const std::string& path)
         name_ = "standard input";
     } else {
         name_ = path;
-        owned_.reset(std::fopen(path.c_str(), "rb"));
+        owned_ = avpost::detail::OpenFile(path.c_str(), "rb");
         if (!owned_)
             Fail(path, std::strerror(errno));
         file_ = owned_.get();

@@ -2,9 +2,9 @@
 #define AVPOST_TOOLS_AVPOST_FORMATS_INPUTFILE_H
 
 #include <cstdio>
-#include <memory>
 #include <string>
 
+#include "support/FileHandle.h"
 #include "tools/avpost/formats/ByteSource.h"
 
 namespace avpost::tool {
@@ -25,10 +25,7 @@ public:
     long long size() const override { return size_; }
 
 private:
-    struct Closer {
-        void operator()(std::FILE* file) const { std::fclose(file); }
-    };
-    std::unique_ptr<std::FILE, Closer> owned_;
+    avpost::detail::FileHandle owned_;
     std::FILE* file_ = nullptr;
     std::string name_;
     bool seekable_ = false;

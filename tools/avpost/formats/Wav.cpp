@@ -5,12 +5,18 @@
 #include <string>
 #include <vector>
 
+#include "support/LittleEndian.h"
 #include "tools/avpost/common/ToolError.h"
 #include "tools/avpost/formats/ByteSource.h"
 #include "tools/avpost/output/OutputFile.h"
 
 namespace avpost::tool {
 namespace {
+
+using avpost::detail::ReadLe16;
+using avpost::detail::ReadLe32;
+using avpost::detail::StoreLe16;
+using avpost::detail::StoreLe32;
 
 constexpr uint16_t kFormatPcm = 1;
 constexpr uint16_t kFormatFloat = 3;
@@ -28,29 +34,6 @@ constexpr int kMostChannels = 32;   // a 16-bit sample frame then fills the stag
 constexpr int kHighestRate = 768000;
 constexpr long long kRiffSizeOffset = 4;
 
-uint16_t Le16(const unsigned char* p)
-{
-    return static_cast<uint16_t>(p[0] | p[1] << 8);
-}
-
-uint32_t Le32(const unsigned char* p)
-{
-    return static_cast<uint32_t>(p[0]) | static_cast<uint32_t>(p[1]) << 8 | static_cast<uint32_t>(p[2]) << 16 |
-           static_cast<uint32_t>(p[3]) << 24;
-}
-
-void PutLe16(unsigned char* p, uint32_t value)
-{
-    p[0] = static_cast<unsigned char>(value);
-    p[1] = static_cast<unsigned char>(value >> 8);
-}
-
-void PutLe32(unsigned char* p, uint32_t value)
-{
-    PutLe16(p, value & 0xFFFF);
-    PutLe16(p + 2, value >> 16);
-}
-
 std::string SampleFormatName(uint16_t tag, uint16_t bits)
 {
     if (tag == kFormatFloat)
@@ -63,7 +46,7 @@ std::string SampleFormatName(uint16_t tag, uint16_t bits)
 void PatchSize(OutputFile& output, long long offset, uint32_t value)
 {
     unsigned char bytes[4];
-    PutLe32(bytes, value);
+    StoreLe32(bytes, value);
     if (fseeko(output.get(), offset, SEEK_SET) != 0)
         Fail(output.name(), "cannot go back to complete the WAV header");
     output.Write(bytes, sizeof(bytes));
@@ -82,7 +65,7 @@ WavReader::WavReader(ByteSource& input) : input_(input)
         unsigned char chunk[8];
         if (!input_.ReadExactly(chunk, sizeof(chunk), "WAV chunk header"))
             Fail(input_.name(), "WAV file has no data chunk");
-        const uint32_t size = Le32(chunk + 4);
+        const uint32_t size = ReadLe32(chunk + 4);
         if (std::memcmp(chunk, "fmt ", 4) == 0) {
             ReadFormatChunk(size);
         } else if (std::memcmp(chunk, "data", 4) == 0) {
@@ -105,15 +88,15 @@ void WavReader::ReadFormatChunk(uint32_t size)
     std::vector<unsigned char> fmt(size + (size & 1));
     if (!input_.ReadExactly(fmt.data(), fmt.size(), "WAV format chunk"))
         Fail(input_.name(), "truncated WAV format chunk");
-    uint16_t tag = Le16(&fmt[0]);
-    const int channels = Le16(&fmt[2]);
-    const uint32_t rate = Le32(&fmt[4]);
-    const uint16_t blockAlign = Le16(&fmt[12]);
-    const uint16_t bits = Le16(&fmt[14]);
+    uint16_t tag = ReadLe16(&fmt[0]);
+    const int channels = ReadLe16(&fmt[2]);
+    const uint32_t rate = ReadLe32(&fmt[4]);
+    const uint16_t blockAlign = ReadLe16(&fmt[12]);
+    const uint16_t bits = ReadLe16(&fmt[14]);
     uint32_t mask = 0;
     if (tag == kFormatExtensible && size >= kExtensibleFormatBytes) {
-        mask = Le32(&fmt[20]);
-        tag = Le16(&fmt[24]);  // the first two bytes of the sub-format identifier
+        mask = ReadLe32(&fmt[20]);
+        tag = ReadLe16(&fmt[24]);  // the first two bytes of the sub-format identifier
     }
     if (tag != kFormatPcm || bits != 16)
         Fail(input_.name(), "unsupported sample format: " + SampleFormatName(tag, bits) +
@@ -173,24 +156,24 @@ WavWriter::WavWriter(OutputFile& output, const WavFormat& format) : output_(outp
     const uint32_t formatBytes = extensible ? kExtensibleFormatBytes : kPlainFormatBytes;
     std::vector<unsigned char> header(20 + formatBytes + 8, 0);
     std::memcpy(&header[0], "RIFF", 4);
-    PutLe32(&header[4], kUnknownSize);
+    StoreLe32(&header[4], kUnknownSize);
     std::memcpy(&header[8], "WAVEfmt ", 8);
-    PutLe32(&header[16], formatBytes);
+    StoreLe32(&header[16], formatBytes);
     unsigned char* fmt = &header[20];
-    PutLe16(fmt, extensible ? kFormatExtensible : kFormatPcm);
-    PutLe16(fmt + 2, static_cast<uint32_t>(format.channels));
-    PutLe32(fmt + 4, static_cast<uint32_t>(format.sampleRate));
-    PutLe32(fmt + 8, static_cast<uint32_t>(format.BytesPerSecond()));
-    PutLe16(fmt + 12, static_cast<uint32_t>(format.BytesPerFrame()));
-    PutLe16(fmt + 14, 16);
+    StoreLe16(fmt, extensible ? kFormatExtensible : kFormatPcm);
+    StoreLe16(fmt + 2, static_cast<uint32_t>(format.channels));
+    StoreLe32(fmt + 4, static_cast<uint32_t>(format.sampleRate));
+    StoreLe32(fmt + 8, static_cast<uint32_t>(format.BytesPerSecond()));
+    StoreLe16(fmt + 12, static_cast<uint32_t>(format.BytesPerFrame()));
+    StoreLe16(fmt + 14, 16);
     if (extensible) {
-        PutLe16(fmt + 16, kExtensionBytes);
-        PutLe16(fmt + 18, 16);  // valid bits per sample
-        PutLe32(fmt + 20, format.channelMask);
+        StoreLe16(fmt + 16, kExtensionBytes);
+        StoreLe16(fmt + 18, 16);  // valid bits per sample
+        StoreLe32(fmt + 20, format.channelMask);
         std::memcpy(fmt + 24, kPcmSubFormat, sizeof(kPcmSubFormat));
     }
     std::memcpy(&header[20 + formatBytes], "data", 4);
-    PutLe32(&header[24 + formatBytes], kUnknownSize);
+    StoreLe32(&header[24 + formatBytes], kUnknownSize);
     output_.Write(header.data(), header.size());
     headerBytes_ = static_cast<long long>(header.size());
 }

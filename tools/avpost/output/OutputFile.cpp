@@ -96,7 +96,7 @@ OutputFile::OutputFile(const std::string& path)
     // written directly.
     if (!IsDevice(path))
         staged_ = std::make_unique<StagedPath>(path);
-    owned_.reset(std::fopen(staged_ ? staged_->temporary().c_str() : path.c_str(), "wb"));
+    owned_ = avpost::detail::OpenFile(staged_ ? staged_->temporary().c_str() : path.c_str(), "wb");
     if (!owned_)
         Fail(path, "cannot create: " + SystemError());
     file_ = owned_.get();
@@ -123,7 +123,7 @@ void OutputFile::Commit()
         FailToWrite();
     if (!owned_)
         return;
-    if (std::fclose(owned_.release()) != 0)
+    if (avpost::detail::CloseFile(owned_) != 0)
         FailToWrite();
     file_ = nullptr;
     if (staged_)

@@ -6,6 +6,8 @@
 #include <memory>
 #include <string>
 
+#include "support/FileHandle.h"
+
 namespace avpost::tool {
 
 // A file that appears under its name only once it is complete. It is written under a temporary
@@ -54,11 +56,8 @@ public:
 private:
     [[noreturn]] void FailToWrite() const;
 
-    struct Closer {
-        void operator()(std::FILE* file) const { std::fclose(file); }
-    };
     std::unique_ptr<StagedPath> staged_;
-    std::unique_ptr<std::FILE, Closer> owned_;
+    avpost::detail::FileHandle owned_;
     std::FILE* file_ = nullptr;
     std::string name_;
 };

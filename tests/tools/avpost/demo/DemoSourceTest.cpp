@@ -8,7 +8,7 @@
 #include <utility>
 #include <vector>
 
-#include "support/ScriptedAudioDecoder.h"
+#include "doubles/ScriptedAudioDecoder.h"
 #include "tools/avpost/demo/DemoPicture.h"
 #include "tools/avpost/sources/Tally.h"
 

@@ -10,7 +10,8 @@
 namespace avpost::tool {
 namespace {
 
-using testing::Le;
+using testing::Le16;
+using testing::Le32;
 
 Bitmap32 Read(const std::string& bytes)
 {
@@ -20,9 +21,9 @@ Bitmap32 Read(const std::string& bytes)
 
 std::string BmpBytes(int width, int height, int bits, const std::string& rows, uint32_t compression = 0)
 {
-    return "BM" + Le(static_cast<uint32_t>(54 + rows.size()), 4) + Le(0, 4) + Le(54, 4) + Le(40, 4) +
-           Le(static_cast<uint32_t>(width), 4) + Le(static_cast<uint32_t>(height), 4) + Le(1, 2) +
-           Le(static_cast<uint32_t>(bits), 2) + Le(compression, 4) + Le(static_cast<uint32_t>(rows.size()), 4) +
+    return "BM" + Le32(static_cast<uint32_t>(54 + rows.size())) + Le32(0) + Le32(54) + Le32(40) +
+           Le32(static_cast<uint32_t>(width)) + Le32(static_cast<uint32_t>(height)) + Le16(1) +
+           Le16(static_cast<uint32_t>(bits)) + Le32(compression) + Le32(static_cast<uint32_t>(rows.size())) +
            std::string(16, '\0') + rows;
 }
 

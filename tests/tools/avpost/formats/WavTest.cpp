@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "ToolTestSupport.h"
+#include "support/LittleEndian.h"
 #include "tools/avpost/formats/InputFile.h"
 #include "tools/avpost/formats/WavAudioDecoder.h"
 #include "tools/avpost/output/OutputFile.h"
@@ -15,7 +16,8 @@
 namespace avpost::tool {
 namespace {
 
-using testing::Le;
+using testing::Le16;
+using testing::Le32;
 using testing::ReadWholeFile;
 using testing::TempDir;
 using testing::WriteWholeFile;
@@ -37,15 +39,15 @@ std::string WavBytes(const WavLayout& layout)
 {
     const uint16_t align = layout.blockAlign >= 0 ? static_cast<uint16_t>(layout.blockAlign)
                                                 : static_cast<uint16_t>(layout.channels * layout.bits / 8);
-    std::string fmt = Le(layout.subFormat ? 0xFFFE : layout.tag, 2) + Le(layout.channels, 2) + Le(layout.rate, 4) +
-                      Le(layout.rate * align, 4) + Le(align, 2) + Le(layout.bits, 2);
+    std::string fmt = Le16(layout.subFormat ? 0xFFFE : layout.tag) + Le16(layout.channels) + Le32(layout.rate) +
+                      Le32(layout.rate * align) + Le16(align) + Le16(layout.bits);
     if (layout.subFormat)
-        fmt += Le(22, 2) + Le(layout.bits, 2) + Le(layout.mask, 4) + Le(layout.subFormat, 2) +
+        fmt += Le16(22) + Le16(layout.bits) + Le32(layout.mask) + Le16(layout.subFormat) +
                std::string("\x00\x00\x00\x00\x10\x00\x80\x00\x00\xAA\x00\x38\x9B\x71", 14);
     const uint32_t dataSize = layout.statedDataSize ? layout.statedDataSize : static_cast<uint32_t>(layout.samples.size());
-    const std::string body = "WAVEfmt " + Le(static_cast<uint32_t>(fmt.size()), 4) + fmt + layout.beforeData + "data" +
-                             Le(dataSize, 4) + layout.samples;
-    return "RIFF" + Le(static_cast<uint32_t>(body.size()), 4) + body;
+    const std::string body = "WAVEfmt " + Le32(static_cast<uint32_t>(fmt.size())) + fmt + layout.beforeData + "data" +
+                             Le32(dataSize) + layout.samples;
+    return "RIFF" + Le32(static_cast<uint32_t>(body.size())) + body;
 }
 
 // Reads a whole WAV file; the error text when it fails.
@@ -131,7 +133,7 @@ TEST(WavFormat, ReadsSixteenBitPcmInAnyLayoutAndRefusesTheRestWithAReason)
         const char* reason;
     } cases[] = {
         {with([](WavLayout& s) { s.subFormat = 1; }), ""},
-        {with([](WavLayout& s) { s.beforeData = "LIST" + Le(5, 4) + "abcde" + std::string(1, '\0'); }), ""},  // padded
+        {with([](WavLayout& s) { s.beforeData = "LIST" + Le32(5) + "abcde" + std::string(1, '\0'); }), ""},  // padded
         {with([](WavLayout& s) { s.statedDataSize = 0xFFFFFFFF; }), ""},  // a stream: read to its end
         {with([](WavLayout& s) { s.bits = 8; }), "unsupported sample format: 8-bit PCM (only 16-bit PCM is read)"},
         {with([](WavLayout& s) { s.bits = 24; }), "24-bit PCM"},
@@ -143,9 +145,9 @@ TEST(WavFormat, ReadsSixteenBitPcmInAnyLayoutAndRefusesTheRestWithAReason)
         {with([](WavLayout& s) { s.blockAlign = 3; }), "WAV block size 3 does not match 2 channels"},
         {with([](WavLayout& s) { s.statedDataSize = 100; }), "truncated sample data (16 of 100 bytes)"},
         {with([](WavLayout& s) { s.samples = std::string(18, '\0'); }), "the last sample frame is incomplete"},
-        {"RIFF" + Le(4, 4) + "WAVE", "WAV file has no data chunk"},
-        {"RIFX" + Le(4, 4) + "WAVE", "not a WAV (RIFF WAVE) file"},
-        {"RIFF" + Le(12, 4) + "WAVEdata" + Le(0, 4), "data chunk comes before its format chunk"},
+        {"RIFF" + Le32(4) + "WAVE", "WAV file has no data chunk"},
+        {"RIFX" + Le32(4) + "WAVE", "not a WAV (RIFF WAVE) file"},
+        {"RIFF" + Le32(12) + "WAVEdata" + Le32(0), "data chunk comes before its format chunk"},
     };
     for (const auto& c : cases) {
         WriteWholeFile(dir.File("a.wav"), c.bytes);
@@ -167,7 +169,7 @@ TEST(WavAudioSource, HandsOutStampedBlocksAndSeeks)
     layout.rate = 8000;
     layout.samples.clear();
     for (int i = 0; i < 5000; ++i)
-        layout.samples += Le(static_cast<uint32_t>(i), 2);
+        layout.samples += Le16(static_cast<uint32_t>(i));
     WriteWholeFile(dir.File("a.wav"), WavBytes(layout));
     WavAudioDecoder source;
     source.OpenFile(dir.File("a.wav"));
@@ -185,7 +187,7 @@ TEST(WavAudioSource, HandsOutStampedBlocksAndSeeks)
     EXPECT_DOUBLE_EQ(source.Seek(0.5), 0.5);
     block = source.GetNextFrame();
     ASSERT_NE(block, nullptr);
-    EXPECT_EQ(std::make_tuple(block->data[0] | block->data[1] << 8, block->startTime), std::make_tuple(4000, 5000000));
+    EXPECT_EQ(std::make_tuple(avpost::detail::ReadLe16(block->data), block->startTime), std::make_tuple(4000, 5000000));
     EXPECT_EQ(source.failure(), "");
 }
 

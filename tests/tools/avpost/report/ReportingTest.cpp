@@ -6,6 +6,7 @@
 #include <thread>
 
 #include "ToolTestSupport.h"
+#include "support/FileHandle.h"
 #include "tools/avpost/report/JsonReport.h"
 #include "tools/avpost/report/Progress.h"
 #include "tools/avpost/report/Summary.h"
@@ -23,17 +24,17 @@ TEST(ProgressLine, SaysWhereHowFastAndHowLongIsLeftWhenEnabledAndClearsItselfAwa
     EXPECT_EQ(unknown.Line(0.0, 0, 0.0), "audio  0.0 s");
 
     testing::TempDir dir;
-    std::FILE* terminal = std::fopen(dir.File("terminal").c_str(), "w");
+    auto terminal = avpost::detail::OpenFile(dir.File("terminal").c_str(), "w");
     {
-        Progress silent("video", 10.0, false, terminal);
+        Progress silent("video", 10.0, false, terminal.get());
         std::this_thread::sleep_for(std::chrono::milliseconds(300));
         silent.Update(1.0, 25);
-        Progress shown("video", 10.0, true, terminal);
+        Progress shown("video", 10.0, true, terminal.get());
         shown.Update(0.5, 10);  // too soon after the start: not drawn
         std::this_thread::sleep_for(std::chrono::milliseconds(300));
         shown.Update(1.0, 25);
     }
-    std::fclose(terminal);
+    terminal.reset();
     const std::string text = testing::ReadWholeFile(dir.File("terminal"));
     ASSERT_EQ(text.rfind("\rvideo  1.0 s of 10.0 s (10 %)  25 pictures", 0), 0u) << text;  // nothing from the silent one
     const size_t width = text.find('\r', 1) - 1;

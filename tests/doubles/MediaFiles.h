@@ -1,18 +1,17 @@
-#ifndef AVPOST_TESTS_SUPPORT_MEDIAFILES_H
-#define AVPOST_TESTS_SUPPORT_MEDIAFILES_H
+#ifndef AVPOST_TESTS_DOUBLES_MEDIAFILES_H
+#define AVPOST_TESTS_DOUBLES_MEDIAFILES_H
 
 #include <cstdint>
 #include <string>
 #include <vector>
 
+#include "support/LittleEndian.h"
+
 // Small valid files of the formats the tool reads, for tests and as fuzz seeds.
 namespace media_files {
 
-inline void PutLe(std::vector<uint8_t>& out, uint32_t value, int bytes)
-{
-    for (int i = 0; i < bytes; ++i)
-        out.push_back(static_cast<uint8_t>(value >> (8 * i)));
-}
+using avpost::detail::AppendLe16;
+using avpost::detail::AppendLe32;
 
 // An uncompressed BMP of w x h pixels of `bits` (24 or 32) per pixel, rows padded to 4 bytes,
 // bottom-up unless h is negative.
@@ -21,16 +20,16 @@ inline std::vector<uint8_t> Bmp(int w, int h, int bits, uint8_t shade)
     const uint32_t rows = static_cast<uint32_t>(h < 0 ? -h : h);
     const uint32_t rowBytes = (static_cast<uint32_t>(w) * bits / 8 + 3) & ~3u;
     std::vector<uint8_t> file = {'B', 'M'};
-    PutLe(file, 54 + rowBytes * rows, 4);
-    PutLe(file, 0, 4);
-    PutLe(file, 54, 4);
-    PutLe(file, 40, 4);
-    PutLe(file, static_cast<uint32_t>(w), 4);
-    PutLe(file, static_cast<uint32_t>(h), 4);
-    PutLe(file, 1, 2);
-    PutLe(file, static_cast<uint32_t>(bits), 2);
+    AppendLe32(file, 54 + rowBytes * rows);
+    AppendLe32(file, 0);
+    AppendLe32(file, 54);
+    AppendLe32(file, 40);
+    AppendLe32(file, static_cast<uint32_t>(w));
+    AppendLe32(file, static_cast<uint32_t>(h));
+    AppendLe16(file, 1);
+    AppendLe16(file, static_cast<uint32_t>(bits));
     for (int i = 0; i < 6; ++i)
-        PutLe(file, 0, 4);
+        AppendLe32(file, 0);
     for (uint32_t i = 0; i < rowBytes * rows; ++i)
         file.push_back(static_cast<uint8_t>(shade + i * 7));
     return file;
@@ -57,26 +56,26 @@ inline std::vector<uint8_t> Wav(int rate, int channels, int frames, uint32_t cha
     const bool extensible = channelMask != 0;
     const uint32_t formatBytes = extensible ? 40 : 16, dataBytes = static_cast<uint32_t>(frames * channels * 2);
     std::vector<uint8_t> file = {'R', 'I', 'F', 'F'};
-    PutLe(file, 4 + 8 + formatBytes + 8 + dataBytes, 4);
+    AppendLe32(file, 4 + 8 + formatBytes + 8 + dataBytes);
     for (char c : std::string("WAVEfmt "))
         file.push_back(static_cast<uint8_t>(c));
-    PutLe(file, formatBytes, 4);
-    PutLe(file, extensible ? 0xFFFE : 1, 2);
-    PutLe(file, static_cast<uint32_t>(channels), 2);
-    PutLe(file, static_cast<uint32_t>(rate), 4);
-    PutLe(file, static_cast<uint32_t>(rate * channels * 2), 4);
-    PutLe(file, static_cast<uint32_t>(channels * 2), 2);
-    PutLe(file, 16, 2);
+    AppendLe32(file, formatBytes);
+    AppendLe16(file, extensible ? 0xFFFE : 1);
+    AppendLe16(file, static_cast<uint32_t>(channels));
+    AppendLe32(file, static_cast<uint32_t>(rate));
+    AppendLe32(file, static_cast<uint32_t>(rate * channels * 2));
+    AppendLe16(file, static_cast<uint32_t>(channels * 2));
+    AppendLe16(file, 16);
     if (extensible) {
-        PutLe(file, 22, 2);
-        PutLe(file, 16, 2);
-        PutLe(file, channelMask, 4);
+        AppendLe16(file, 22);
+        AppendLe16(file, 16);
+        AppendLe32(file, channelMask);
         const uint8_t pcm[16] = {1, 0, 0, 0, 0, 0, 0x10, 0, 0x80, 0, 0, 0xAA, 0, 0x38, 0x9B, 0x71};
         file.insert(file.end(), pcm, pcm + 16);
     }
     for (char c : std::string("data"))
         file.push_back(static_cast<uint8_t>(c));
-    PutLe(file, dataBytes, 4);
+    AppendLe32(file, dataBytes);
     for (uint32_t i = 0; i < dataBytes; ++i)
         file.push_back(static_cast<uint8_t>(i * 13));
     return file;

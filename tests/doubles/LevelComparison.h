@@ -1,5 +1,5 @@
-#ifndef AVPOST_TESTS_SUPPORT_LEVELCOMPARISON_H
-#define AVPOST_TESTS_SUPPORT_LEVELCOMPARISON_H
+#ifndef AVPOST_TESTS_DOUBLES_LEVELCOMPARISON_H
+#define AVPOST_TESTS_DOUBLES_LEVELCOMPARISON_H
 
 #include <algorithm>
 #include <functional>
@@ -8,9 +8,9 @@
 #include <string>
 #include <vector>
 
+#include "doubles/GuardedBuffer.h"
+#include "doubles/SimdLevels.h"
 #include "support/CpuFeatures.h"
-#include "support/GuardedBuffer.h"
-#include "support/SimdLevels.h"
 
 // Runs one piece of picture work at every instruction-set level on the same random buffers and
 // reports where a level's bytes first differ from the scalar reference's.
