@@ -9,6 +9,8 @@ function(avpost_compile_options target)
     $<$<CXX_COMPILER_ID:GNU>:-Wconversion>
     # Pixel and sample arithmetic must give the same bits on every build.
     -ffp-contract=off)
+  # Media files pass 2 GiB; 32-bit builds need 64-bit file offsets for them.
+  target_compile_definitions(${target} PRIVATE _FILE_OFFSET_BITS=64)
   if(AVPOST_WARNINGS_AS_ERRORS)
     target_compile_options(${target} PRIVATE -Werror)
   endif()

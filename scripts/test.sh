@@ -1,9 +1,9 @@
 #!/usr/bin/env bash
 # Builds and tests the library four ways: x86-64 (with its Debian packages, and a smoke run of
 # every benchmark), 32-bit x86 (-m32), x86-64 with AddressSanitizer and
-# UndefinedBehaviorSanitizer, and the tests labelled "threads" under ThreadSanitizer; then runs
-# every fuzz target briefly over its kept corpus (clang's libFuzzer). Exits non-zero on the first
-# failure.
+# UndefinedBehaviorSanitizer, and the tests labelled "threads" under ThreadSanitizer, each with
+# every compiler warning an error; then runs every fuzz target briefly over its kept corpus
+# (clang's libFuzzer). Exits non-zero on the first failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
@@ -16,7 +16,7 @@ build_root=${AVPOST_BUILD_ROOT:-build}
 variant() {
   local name=$1; shift
   echo "== ${name} =="
-  cmake -S . -B "${build_root}/${name}" -G Ninja "$@" >/dev/null
+  cmake -S . -B "${build_root}/${name}" -G Ninja -DAVPOST_WARNINGS_AS_ERRORS=ON "$@" >/dev/null
   cmake --build "${build_root}/${name}" -j "${jobs}" ${build_target:+--target "${build_target}"}
   ctest --test-dir "${build_root}/${name}" -j "${jobs}" --output-on-failure --no-tests=error \
     ${test_label:+-L "${test_label}"}

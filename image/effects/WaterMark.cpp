@@ -198,7 +198,7 @@ void BlendAligned(const PackedPicture& dst, const Watermark& mark, Position at, 
         const EvenRun chroma = EvenIn(cols.first, cols.end);
         if (r % 2 != 0 || chromaRow < 0 || chromaRow >= dst.chromaHeight || chroma.count == 0)
             continue;
-        const ptrdiff_t under = chromaRow * dst.chromaWidth + (at.x + chroma.first) / 2;
+        const auto under = static_cast<ptrdiff_t>(chromaRow * dst.chromaWidth + (at.x + chroma.first) / 2);
         const ptrdiff_t over = static_cast<ptrdiff_t>(r / 2) * src.chromaWidth + chroma.first / 2;
         BlendChromaRun({dst.u + under, dst.v + under, src.u + over, src.v + over, alpha + chroma.first}, chroma.count,
                        level);
