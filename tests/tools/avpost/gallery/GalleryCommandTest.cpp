@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -31,8 +32,10 @@ std::vector<std::string> Rows(const std::string& path)
     const Bitmap32 bitmap = ReadBmp(input);
     std::vector<std::string> rows(static_cast<size_t>(bitmap.height));
     for (int y = 0; y < bitmap.height; ++y)
-        for (int x = 0; x < bitmap.width; ++x)
-            rows[static_cast<size_t>(y)].append(reinterpret_cast<const char*>(&bitmap.pixels[(static_cast<size_t>(y) * bitmap.width + x) * 4]), 3);
+        for (int x = 0; x < bitmap.width; ++x) {
+            const uint8_t* pixel = &bitmap.pixels[(static_cast<size_t>(y) * bitmap.width + x) * 4];
+            rows[static_cast<size_t>(y)].append(reinterpret_cast<const char*>(pixel), 3);
+        }
     return rows;
 }
 
@@ -48,11 +51,13 @@ std::string Mirrored(const std::string& row)
 bool Holds(const std::vector<std::string>& sheet, const std::vector<std::string>& picture)
 {
     for (size_t top = 0; top + picture.size() <= sheet.size(); ++top) {
-        for (size_t at = sheet[top].find(picture[0]); at != std::string::npos; at = sheet[top].find(picture[0], at + 1)) {
-            size_t row = 1;
-            while (row < picture.size() && sheet[top + row].compare(at, picture[row].size(), picture[row]) == 0)
-                ++row;
-            if (at % 3 == 0 && row == picture.size())
+        const std::string& line = sheet[top];
+        for (size_t at = line.find(picture[0]); at != std::string::npos; at = line.find(picture[0], at + 1)) {
+            size_t matched = 1;
+            while (matched < picture.size() &&
+                   sheet[top + matched].compare(at, picture[matched].size(), picture[matched]) == 0)
+                ++matched;
+            if (at % 3 == 0 && matched == picture.size())
                 return true;
         }
     }
@@ -63,20 +68,16 @@ class GalleryRun : public ::testing::Test {
 protected:
     static void SetUpTestSuite()
     {
-        folder_ = new testing::TempDir;
-        run_ = new RunResult(Avpost({"gallery", folder_->path()}));
+        folder_ = std::make_unique<testing::TempDir>();
+        run_ = Avpost({"gallery", folder_->path()});
     }
-    static void TearDownTestSuite()
-    {
-        delete run_;
-        delete folder_;
-    }
-    void SetUp() override { ASSERT_EQ(run_->exitCode, 0) << run_->err; }
+    static void TearDownTestSuite() { folder_.reset(); }
+    void SetUp() override { ASSERT_EQ(run_.exitCode, 0) << run_.err; }
 
     static std::vector<std::string> Tile(const std::string& name) { return Rows(folder_->File(name + ".bmp")); }
 
-    static inline testing::TempDir* folder_ = nullptr;
-    static inline RunResult* run_ = nullptr;
+    static inline std::unique_ptr<testing::TempDir> folder_;
+    static inline RunResult run_;
 };
 
 TEST_F(GalleryRun, WritesEveryTileAndTheSheetHoldingThemAll)
@@ -86,8 +87,8 @@ TEST_F(GalleryRun, WritesEveryTileAndTheSheetHoldingThemAll)
         expected.push_back(tile.name + ".bmp");
     std::sort(expected.begin(), expected.end());
     EXPECT_EQ(folder_->List(), expected);  // no temporary files left over
-    EXPECT_EQ(run_->err, "");
-    EXPECT_NE(run_->out.find(folder_->path()), std::string::npos) << run_->out;
+    EXPECT_EQ(run_.err, "");
+    EXPECT_NE(run_.out.find(folder_->path()), std::string::npos) << run_.out;
 
     const std::vector<std::string> sheet = Rows(folder_->File("gallery.bmp"));
     EXPECT_LT(sheet[0].size() / 3, 1600u);
@@ -109,7 +110,9 @@ TEST_F(GalleryRun, MirrorsAndFiltersShowWhatTheirNamesSay)
         EXPECT_EQ(vflip[y], original[original.size() - 1 - y]) << "row " << y;
     }
     // Grey through the library's RGB conversion: its rounding leaves the three within one level.
-    const auto near = [](char a, char b) { return std::abs(static_cast<unsigned char>(a) - static_cast<unsigned char>(b)) <= 1; };
+    const auto near = [](char a, char b) {
+        return std::abs(static_cast<unsigned char>(a) - static_cast<unsigned char>(b)) <= 1;
+    };
     for (const std::string& row : Tile("filter-gray"))
         for (size_t x = 0; x < row.size(); x += 3)
             ASSERT_TRUE(near(row[x], row[x + 1]) && near(row[x], row[x + 2])) << "pixel " << x / 3;
