@@ -53,5 +53,5 @@ std::vector<std::vector<uint8_t>> FuzzSeeds()
                     "even-average", "--filter", "sepia,negative", "--capture", "0:00:02.500=still.jpg", "--crop",
                     "10:10:300:200", "--watermark", "logo.bmp", "--watermark-pos", "top-right", "--rotate", "auto"}),
             Joined({"audio", "in.wav", "-", "--rate", "44100", "--channels", "2", "--volume", "80", "--continuous"}),
-            Joined({"demo", "folder"}), Joined({"--help"})};
+            Joined({"demo", "folder"}), Joined({"gallery", "folder"}), Joined({"--help"})};
 }

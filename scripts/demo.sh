@@ -4,12 +4,5 @@
 # Usage: scripts/demo.sh [FOLDER]   (default: avpost-demo in the current folder)
 set -euo pipefail
 folder=$(realpath -m "${1:-avpost-demo}")
-cd "$(dirname "$0")/.."
-
-scripts/install-deps.sh
-
-build="${AVPOST_BUILD_ROOT:-build}/release"
-cmake -S . -B "$build" -G Ninja -DCMAKE_BUILD_TYPE=Release \
-  -DAVPOST_BUILD_TESTS=OFF -DAVPOST_BUILD_BENCHMARKS=OFF >/dev/null
-cmake --build "$build" --target avpost_tool -j "$(nproc)"
-"$build/tools/avpost/avpost" demo "$folder"
+tool=$("$(dirname "$0")/build-tool.sh")
+"$tool" demo "$folder"

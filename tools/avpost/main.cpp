@@ -59,6 +59,9 @@ int Execute(const avpost::tool::Invocation& call)
     case Command::Convert:
         avpost::tool::RunConvertCommand(call);
         return 0;
+    case Command::Gallery:
+        avpost::tool::RunGalleryCommand(call);
+        return 0;
     }
     return kFailed;
 }

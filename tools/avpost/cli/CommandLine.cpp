@@ -84,13 +84,24 @@ void ApplyDefaults(Invocation& call)
 
 const char* CommandName(unsigned bit)
 {
-    return bit == kForDemo ? "demo" : bit == kForVideo ? "video" : bit == kForAudio ? "audio" : "convert";
+    switch (bit) {
+    case kForDemo:
+        return "demo";
+    case kForVideo:
+        return "video";
+    case kForAudio:
+        return "audio";
+    case kForGallery:
+        return "gallery";
+    default:
+        return "convert";
+    }
 }
 
 std::string CommandsOf(const OptionSpec& spec)
 {
     std::vector<std::string> names;
-    for (unsigned bit : {kForDemo, kForVideo, kForAudio, kForConvert})
+    for (unsigned bit : {kForDemo, kForVideo, kForAudio, kForConvert, kForGallery})
         if ((spec.commands & bit) != 0)
             names.push_back("'avpost " + std::string(CommandName(bit)) + "'");
     std::string text;
@@ -114,11 +125,13 @@ Command CommandNamed(const std::string& word)
         return Command::Audio;
     if (word == "convert")
         return Command::Convert;
+    if (word == "gallery")
+        return Command::Gallery;
     if (word == "help" || word == "--help" || word == "-h")
         return Command::Help;
     if (word == "--version")
         return Command::Version;
-    Fail(word, "unknown command (use convert, video, audio or demo; see avpost --help)");
+    Fail(word, "unknown command (use convert, video, audio, demo or gallery; see avpost --help)");
 }
 
 // Applies the option at args[at]; returns how many arguments it used.
@@ -167,11 +180,17 @@ bool AsksForHelp(const std::vector<std::string>& args)
 
 void Place(Invocation& call, std::vector<std::string>& positional)
 {
-    const size_t wanted = call.command == Command::Demo ? 1 : 2;
+    const size_t wanted = call.command == Command::Demo || call.command == Command::Gallery ? 1 : 2;
     if (positional.size() > wanted)
         Fail(positional[wanted], "unexpected argument");
     if (call.command == Command::Demo) {
         call.output = positional.empty() ? "avpost-demo" : positional[0];
+        return;
+    }
+    if (call.command == Command::Gallery) {
+        if (positional.empty())
+            Fail("avpost gallery", "needs the FOLDER to write into");
+        call.output = positional[0];
         return;
     }
     if (positional.size() < wanted)

@@ -16,7 +16,9 @@ Usage:
   avpost video INPUT OUTPUT [options]    process the pictures of a file into Y4M
   avpost audio INPUT OUTPUT [options]    process the sound of a file into WAV
   avpost demo [FOLDER]                   run the stages on built-in test media
-  avpost help [convert|video|audio|demo] this text, or one command's part
+  avpost gallery FOLDER                  one test picture through every effect,
+                                         and a contact sheet of them
+  avpost help [COMMAND]                  this text, or one command's part
 
 INPUT is a Y4M (4:2:0) or 16-bit PCM WAV file, or any media file that FFmpeg's
 libraries read (mp4, mkv, mov, ...) when avpost was built with them. OUTPUT is a
@@ -39,6 +41,17 @@ avpost demo [FOLDER]
   the video and audio stages with a representative configuration, and writes
   into FOLDER (default: avpost-demo) demo.y4m, demo.wav, capture.bmp and
   capture.jpg.
+)";
+
+const char kGalleryIntro[] = R"(
+avpost gallery FOLDER
+  Runs one test picture through the video stage once for every effect: each
+  filter, both mirrors, the adjustments, each --fit policy (on a square
+  picture), each --deinterlace style (on an interlaced picture whose bar moved
+  between the fields), the fixed watermark at each place and the user
+  watermark. Writes into FOLDER, which must exist, one BMP per effect named
+  for what it shows (filter-sepia.bmp, fit-keep.bmp, deinterlace-even.bmp, ...)
+  and gallery.bmp, a contact sheet of them all with labels.
 )";
 
 const char kVideoIntro[] = R"(
@@ -70,6 +83,8 @@ avpost convert INPUT OUTPUT [options]
 
 const std::vector<HelpExample> kDemoExamples = {
     {"demo /tmp/avpost-demo", "&& ffplay /tmp/avpost-demo/demo.y4m"}};
+const std::vector<HelpExample> kGalleryExamples = {
+    {"gallery /tmp", "&& ffmpeg -i /tmp/gallery.bmp gallery.png"}};
 const std::vector<HelpExample> kVideoExamples = {
     {"video talk.mp4 talk.y4m --size 1280x720 --fps 25", ""},
     {"video tape.mkv - --deinterlace even-average --size 640x480", "| ffmpeg -i - -c:v libx264 tape.mp4"},
@@ -187,6 +202,8 @@ std::string CommandHelp(const std::string& topic)
 {
     if (topic == "demo")
         return std::string(kDemoIntro) + ExampleList(kDemoExamples);
+    if (topic == "gallery")
+        return std::string(kGalleryIntro) + ExampleList(kGalleryExamples);
     if (topic == "video")
         return std::string(kVideoIntro) + OptionList(kForVideo) + ExampleList(kVideoExamples);
     if (topic == "convert")
@@ -196,7 +213,7 @@ std::string CommandHelp(const std::string& topic)
 
 bool IsTopic(const std::string& topic)
 {
-    return topic == "demo" || topic == "video" || topic == "audio" || topic == "convert";
+    return topic == "demo" || topic == "video" || topic == "audio" || topic == "convert" || topic == "gallery";
 }
 
 }  // namespace
@@ -205,7 +222,8 @@ std::string HelpText(const std::string& topic)
 {
     if (IsTopic(topic))
         return CommandHelp(topic).substr(1);
-    return Overview() + CommandHelp("convert") + CommandHelp("video") + CommandHelp("audio") + CommandHelp("demo");
+    return Overview() + CommandHelp("convert") + CommandHelp("video") + CommandHelp("audio") + CommandHelp("demo") +
+           CommandHelp("gallery");
 }
 
 std::string ShortUsage()
@@ -214,6 +232,7 @@ std::string ShortUsage()
            "       avpost video INPUT OUTPUT.y4m [options]\n"
            "       avpost audio INPUT OUTPUT.wav [options]\n"
            "       avpost demo [FOLDER]\n"
+           "       avpost gallery FOLDER\n"
            "       avpost --help   (every option, with examples)\n";
 }
 
@@ -226,6 +245,8 @@ const std::vector<HelpExample>& HelpExamples(const std::string& command)
 {
     if (command == "convert")
         return kConvertExamples;
+    if (command == "gallery")
+        return kGalleryExamples;
     return command == "demo" ? kDemoExamples : command == "video" ? kVideoExamples : kAudioExamples;
 }
 

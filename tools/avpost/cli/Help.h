@@ -7,7 +7,7 @@
 namespace avpost::tool {
 
 // The text of avpost --help, its option lists written from the option table. topic "convert",
-// "video", "audio" or "demo" gives that command's part; anything else the whole text.
+// "video", "audio", "demo" or "gallery" gives that command's part; anything else the whole text.
 std::string HelpText(const std::string& topic);
 
 // The few lines printed when avpost runs without arguments.

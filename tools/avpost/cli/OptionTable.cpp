@@ -30,7 +30,7 @@ void SetWatermarkPlace(Invocation& call, const OptionValue& value)
 
 std::vector<OptionSpec> MakeTable()
 {
-    const unsigned kAll = kForDemo | kForVideo | kForAudio | kForConvert;
+    const unsigned kAll = kForDemo | kForVideo | kForAudio | kForConvert | kForGallery;
     const unsigned kPictures = kForVideo | kForConvert;
     const unsigned kSounds = kForAudio | kForConvert;
     const unsigned kRuns = kForVideo | kForAudio | kForConvert;
@@ -245,6 +245,11 @@ std::vector<OptionSpec> MakeTable()
 
 }  // namespace
 
+const std::vector<Choice>& WatermarkPlaces()
+{
+    return kPlaces;
+}
+
 const std::vector<OptionSpec>& OptionTable()
 {
     static const std::vector<OptionSpec> table = MakeTable();
@@ -278,6 +283,8 @@ unsigned CommandBit(Command command)
         return kForAudio;
     case Command::Convert:
         return kForConvert;
+    case Command::Gallery:
+        return kForGallery;
     default:
         return 0;
     }

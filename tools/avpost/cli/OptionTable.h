@@ -16,6 +16,7 @@ constexpr unsigned kForDemo = 1;
 constexpr unsigned kForVideo = 2;
 constexpr unsigned kForAudio = 4;
 constexpr unsigned kForConvert = 8;
+constexpr unsigned kForGallery = 16;
 
 enum class ValueKind {
     Switch,      // no value
@@ -67,13 +68,16 @@ struct OptionSpec {
 
 const std::vector<OptionSpec>& OptionTable();
 
+// The names --watermark-pos takes for the nine places, with their alignment codes.
+const std::vector<Choice>& WatermarkPlaces();
+
 // The spec of a name or alias; nullptr when there is none.
 const OptionSpec* FindOption(const std::string& name);
 
 // "a, b or c": the names of choices as the help and the error messages list them.
 std::string ChoiceNames(const std::vector<Choice>& choices);
 
-// The bit of kForDemo ... for a command; 0 for the others.
+// The bit of kForDemo ... kForGallery for a command; 0 for the others.
 unsigned CommandBit(Command command);
 
 }  // namespace avpost::tool

@@ -17,7 +17,7 @@ namespace avpost::tool {
 // (a crop inside the picture, a channel conversion that can be done) is checked once the
 // input is open. The defaults come from the option table (OptionTable.h).
 
-enum class Command { Usage, Help, Version, Demo, Video, Audio, Convert };
+enum class Command { Usage, Help, Version, Demo, Video, Audio, Convert, Gallery };
 
 // The video stage's colour filter bits; the stage runs them in this order.
 constexpr unsigned kFilterGray = 1;
@@ -136,9 +136,9 @@ struct EncodeSettings {
 
 struct Invocation {
     Command command = Command::Usage;
-    std::string helpTopic;  // with Command::Help: "", "video", "audio", "convert" or "demo"
+    std::string helpTopic;  // with Command::Help: "", "video", "audio", "convert", "demo" or "gallery"
     std::string input;
-    std::string output;  // for demo: the folder
+    std::string output;  // for demo and gallery: the folder
     bool quiet = false;
     VideoSettings video;
     AudioSettings audio;

@@ -6,20 +6,13 @@
 #include <string>
 
 #include "media/MediaFrame.h"
+#include "tools/avpost/demo/ColourBars.h"
 #include "tools/avpost/demo/DemoTimeline.h"
 #include "tools/avpost/demo/PixelFont.h"
 
 namespace avpost::tool {
 namespace {
 
-struct Yuv {
-    unsigned char y, u, v;
-};
-
-// 75 % colour bars in studio range: white, yellow, cyan, green, magenta, red, blue.
-constexpr Yuv kBars[] = {{180, 128, 128}, {162, 44, 142}, {131, 156, 44}, {112, 72, 58},
-                         {84, 184, 198},  {65, 100, 212}, {35, 212, 114}};
-constexpr int kBarCount = sizeof(kBars) / sizeof(kBars[0]);
 constexpr int kBarsBottom = 384;
 constexpr int kRampBottom = 448;
 constexpr unsigned char kCaptionLuma = 40;
@@ -50,7 +43,7 @@ void DrawBackgroundRow(MEDIA_FRAME& frame, int y)
     unsigned char* luma = frame.plane[0] + static_cast<size_t>(y) * frame.pitch[0];
     if (y < kBarsBottom) {
         for (int x = 0; x < kDemoWidth; ++x)
-            luma[x] = kBars[x * kBarCount / kDemoWidth].y;
+            luma[x] = kColourBars[x * kColourBarCount / kDemoWidth].y;
     } else if (y < kRampBottom) {
         for (int x = 0; x < kDemoWidth; ++x)
             luma[x] = static_cast<unsigned char>(16 + x * (235 - 16) / (kDemoWidth - 1));
@@ -66,7 +59,7 @@ void DrawChroma(MEDIA_FRAME& frame, int boxLeft)
         unsigned char* v = frame.plane[2] + static_cast<size_t>(cy) * frame.pitch[2];
         const bool inBars = cy * 2 < kBarsBottom;
         for (int cx = 0; cx < kDemoWidth / 2; ++cx) {
-            const Yuv bar = kBars[cx * 2 * kBarCount / kDemoWidth];
+            const StudioYuv bar = kColourBars[cx * 2 * kColourBarCount / kDemoWidth];
             u[cx] = inBars ? bar.u : kNeutral;
             v[cx] = inBars ? bar.v : kNeutral;
         }

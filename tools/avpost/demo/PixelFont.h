@@ -5,8 +5,8 @@
 
 namespace avpost::tool {
 
-// A 5 x 7 pixel font with the few characters the demo draws: digits, upper-case letters of
-// its captions, space, '.', ':' and '/'. Other characters draw as blanks.
+// A 5 x 7 pixel font for the captions and labels the tool draws: digits, upper-case letters,
+// space and . : / - + % , ( ). Other characters draw as blanks.
 constexpr int kGlyphWidth = 5;
 constexpr int kGlyphHeight = 7;
 constexpr int kGlyphAdvance = 6;  // one blank column between characters

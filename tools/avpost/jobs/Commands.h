@@ -10,6 +10,7 @@ void RunConvertCommand(const Invocation& call);
 void RunVideoCommand(const Invocation& call);
 void RunAudioCommand(const Invocation& call);
 void RunDemoCommand(const Invocation& call);
+void RunGalleryCommand(const Invocation& call);
 
 }  // namespace avpost::tool
 

@@ -68,6 +68,7 @@ TEST(CommandLine, AudioOptionsDefaultsAndPlainWords)
     EXPECT_EQ(std::tie(audio.sampleRate, audio.channels, audio.volume, audio.continuous),
               std::make_tuple(44100, 1, 250, true));
     EXPECT_EQ(Parse({"demo"}).output, "avpost-demo");
+    EXPECT_EQ(Parse({"gallery", "docs/"}).output, "docs/");
     EXPECT_EQ(Parse({"video", "in", "--", "-odd-name"}).output, "-odd-name");
     EXPECT_EQ(Parse({"video", "--watermark-pos", "10:20:30:40", "a", "b"}).video.watermark.rect.right, 40);
 }
@@ -209,7 +210,7 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
         for (const Choice& choice : spec.choices)
             EXPECT_NE(part.find(choice.name), std::string::npos) << spec.name << " " << choice.name;
     }
-    for (const char* topic : {"demo", "video", "audio", "convert"}) {
+    for (const char* topic : {"demo", "video", "audio", "convert", "gallery"}) {
         EXPECT_NE(help.find(HelpText(topic)), std::string::npos) << topic;  // the whole help holds each topic's
         ASSERT_FALSE(HelpExamples(topic).empty()) << topic;
         for (const HelpExample& example : HelpExamples(topic)) {
