@@ -20,7 +20,9 @@ packages=(cmake ninja-build g++ g++-multilib pkg-config googletest libgtest-dev 
           # The command-line tool reads media files through FFmpeg's libraries; its tests use ffmpeg.
           libavformat-dev libavcodec-dev libswscale-dev libswresample-dev libavutil-dev ffmpeg
           # The fuzz targets build with clang's libFuzzer and sanitizers.
-          clang libclang-rt-14-dev)
+          clang libclang-rt-14-dev
+          # scripts/format.sh: one clang-format version, so that every machine formats alike.
+          clang-format-14)
 $with_bench && packages+=(libyuv-dev libturbojpeg0-dev)
 # libjpeg for the 32-bit build, from Debian's i386 architecture. Without it the 32-bit build
 # still passes: it skips the JPEG decoding tests and does not build IJL15.DLL.

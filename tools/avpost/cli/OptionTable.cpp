@@ -47,6 +47,8 @@ std::vector<OptionSpec> MakeTable()
     const ValueKind kChoice = ValueKind::Choice;
     const ValueKind kText = ValueKind::Text;
     const ValueKind kTimedWhole = ValueKind::TimedWhole;
+    // One option per entry, its fields in the order of OptionSpec, laid out by hand.
+    // clang-format off
     return {
         {"--help", "-h", nullptr, kAll, kSwitch, 0, 0, {}, nullptr, nullptr, false, kGeneral,
          "help; after a command, that command's help",
@@ -241,6 +243,7 @@ std::vector<OptionSpec> MakeTable()
          "not -)",
          [](Invocation& c, const OptionValue& v) { c.encode.json = v.text; }},
     };
+    // clang-format on
 }
 
 }  // namespace
