@@ -46,10 +46,7 @@ bool CAudioConverter::CanConvert() const
     return inputChannels > 0 && outputChannels > 0 && inputRate > 0 && outputRate > 0;
 }
 
-bool CAudioConverter::SameFormat() const
-{
-    return inputChannels == outputChannels && inputRate == outputRate;
-}
+bool CAudioConverter::SameFormat() const { return inputChannels == outputChannels && inputRate == outputRate; }
 
 int CAudioConverter::HistoryLength() const
 {
@@ -74,7 +71,8 @@ int64_t CAudioConverter::OutputCount(int64_t mixed) const
 void CAudioConverter::Reserve(int count)
 {
     const double estimate = 2.0 * count * (static_cast<double>(outputRate) / inputRate) *
-                            (static_cast<double>(outputChannels) / inputChannels) + 0.5 + kEstimateSlack;
+                                (static_cast<double>(outputChannels) / inputChannels) +
+                            0.5 + kEstimateSlack;
     const int64_t e = TruncSaturate<int64_t>(estimate);
     const int64_t mixed = avpost::detail::MixedSampleCount(count, inputChannels, outputChannels);
     const int64_t free = static_cast<int64_t>(capacity) - valid;
@@ -166,20 +164,11 @@ int CAudioConverter::Get(short* destination, int count)
     return taken;
 }
 
-int CAudioConverter::GetFreeSize() const
-{
-    return capacity - valid;
-}
+int CAudioConverter::GetFreeSize() const { return capacity - valid; }
 
-int CAudioConverter::GetValidSize() const
-{
-    return valid;
-}
+int CAudioConverter::GetValidSize() const { return valid; }
 
-void CAudioConverter::Reset()
-{
-    valid = 0;
-}
+void CAudioConverter::Reset() { valid = 0; }
 
 void CAudioConverter::ChangeInput(int channels, int rate)
 {

@@ -19,15 +19,9 @@ constexpr int32_t kFillerPiece = 2048;
 constexpr int32_t kAlwaysLoggedDrop = 512;  // smaller dropped blocks are logged one in a hundred
 constexpr int32_t kDropLogInterval = 100;
 
-double Seconds(int64_t time)
-{
-    return static_cast<double>(time) / kUnitsPerSecond;
-}
+double Seconds(int64_t time) { return static_cast<double>(time) / kUnitsPerSecond; }
 
-int32_t FrameBytes(int32_t channels, int32_t bits)
-{
-    return Low32(static_cast<int64_t>(bits) * channels / 8);
-}
+int32_t FrameBytes(int32_t channels, int32_t bits) { return Low32(static_cast<int64_t>(bits) * channels / 8); }
 
 // Where a block belongs on the consumer's time line, in 100 ns units. Wrapping arithmetic:
 // a host's nonsense time stamps must not become undefined behaviour.
@@ -67,15 +61,9 @@ void AudioEvenProcess::Close()
     fillerLeft = 0;
 }
 
-int AudioEvenProcess::Open(const wchar_t*, const DecParam*, int*)
-{
-    return 1;
-}
+int AudioEvenProcess::Open(const wchar_t*, const DecParam*, int*) { return 1; }
 
-double AudioEvenProcess::GetOffset() const
-{
-    return offset;
-}
+double AudioEvenProcess::GetOffset() const { return offset; }
 
 const STREAM_INFO* AudioEvenProcess::GetStreamInfo() const
 {
@@ -211,8 +199,8 @@ void AudioEvenProcess::LogDrop(const MEDIA_FRAME& block, const Format& format)
         return;
     }
     if (cnt % kDropLogInterval == 0)
-        LogEx(L"AudioEvenProcess::Throw away Audio Data %d [%.03f sec/%d bytes] before %.02f sec.", cnt, seconds,
-              size, Seconds(block.startTime));
+        LogEx(L"AudioEvenProcess::Throw away Audio Data %d [%.03f sec/%d bytes] before %.02f sec.", cnt, seconds, size,
+              Seconds(block.startTime));
     cnt = Low32(static_cast<int64_t>(cnt) + 1);
 }
 
@@ -266,7 +254,8 @@ MEDIA_FRAME* AudioEvenProcess::Stamp(int64_t bytesPerSecond)
 {
     frame.startTime = TruncSaturate<int64_t>(offset * kUnitsPerSecond + 0.5);
     frame.streamTime = frame.startTime;
-    frame.duration = TruncSaturate<int32_t>(0.5 + kUnitsPerSecond * frame.dataSize / static_cast<double>(bytesPerSecond));
+    frame.duration =
+        TruncSaturate<int32_t>(0.5 + kUnitsPerSecond * frame.dataSize / static_cast<double>(bytesPerSecond));
     offset += static_cast<double>(frame.dataSize) / static_cast<double>(bytesPerSecond);
     bytesOut += frame.dataSize;
     return &frame;

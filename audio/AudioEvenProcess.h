@@ -44,14 +44,14 @@ public:
     static constexpr int kMaxFrameBytes = 64;
 
     AudioDecoder* source;
-    std::unique_ptr<unsigned char[]> filler;      // whole copies of the last sample frame, then zeros
+    std::unique_ptr<unsigned char[]> filler;  // whole copies of the last sample frame, then zeros
     unsigned char lastSampleFrame[kMaxFrameBytes];
-    int32_t frameSize;                            // bytes per sample frame
-    MEDIA_FRAME frame;                            // the record handed to the consumer
-    MEDIA_FRAME* pending;                         // a source block waiting behind filler
-    double offset;                                // seconds handed out on the consumer's time line
-    int64_t bytesOut;                             // bytes handed out since the last seek
-    int32_t fillerLeft;                           // filler bytes still due before pending
+    int32_t frameSize;     // bytes per sample frame
+    MEDIA_FRAME frame;     // the record handed to the consumer
+    MEDIA_FRAME* pending;  // a source block waiting behind filler
+    double offset;         // seconds handed out on the consumer's time line
+    int64_t bytesOut;      // bytes handed out since the last seek
+    int32_t fillerLeft;    // filler bytes still due before pending
 
     static int32_t cnt;  // dropped blocks of 511 bytes or less, over the whole process
 

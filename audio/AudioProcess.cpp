@@ -30,7 +30,8 @@ int32_t BlockBytes(const MEDIA_FRAME& block)
 void ChangeVolume8(unsigned char* bytes, int32_t count, int32_t volume)
 {
     for (int32_t i = 0; i < count; ++i) {
-        const int64_t scaled = std::clamp<int64_t>(static_cast<int64_t>(bytes[i]) * volume / kUnchanged, -kLimit8, kLimit8);
+        const int64_t scaled =
+            std::clamp<int64_t>(static_cast<int64_t>(bytes[i]) * volume / kUnchanged, -kLimit8, kLimit8);
         bytes[i] = static_cast<unsigned char>(scaled);
     }
 }
@@ -94,20 +95,11 @@ void AudioProcess::Close()
         source->Close();
 }
 
-int AudioProcess::Open(const wchar_t*, const DecParam*, int*)
-{
-    return 1;
-}
+int AudioProcess::Open(const wchar_t*, const DecParam*, int*) { return 1; }
 
-double AudioProcess::Seek(double seconds)
-{
-    return source != nullptr ? source->Seek(seconds) : 0.0;
-}
+double AudioProcess::Seek(double seconds) { return source != nullptr ? source->Seek(seconds) : 0.0; }
 
-double AudioProcess::GetOffset() const
-{
-    return source != nullptr ? source->GetOffset() : 0.0;
-}
+double AudioProcess::GetOffset() const { return source != nullptr ? source->GetOffset() : 0.0; }
 
 const STREAM_INFO* AudioProcess::GetStreamInfo() const
 {
@@ -146,8 +138,8 @@ void AudioProcess::CreateConverter(const MEDIA_FRAME& block)
 {
     converter = std::make_unique<CAudioConverter>(block.param2, outputFormat->channels, block.param1,
                                                   outputFormat->sampleRate, kConverterSamples);
-    outputFrame.reset(CreateAudioFrame(outputFormat->sampleRate, outputFormat->channels,
-                                       outputFormat->bitsPerSample, kOutputBytes));
+    outputFrame.reset(
+        CreateAudioFrame(outputFormat->sampleRate, outputFormat->channels, outputFormat->bitsPerSample, kOutputBytes));
     outputCapacity = kOutputBytes;
 }
 

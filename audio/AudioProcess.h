@@ -56,9 +56,9 @@ public:
     // With conversion, the decoder's stream information with the output format in `audio`.
     const STREAM_INFO* GetStreamInfo() const override;
 
-    AudioDecoder* source;   // the decoder, or the stage's own AudioEvenProcess
-    AudioDecoder* decoder;  // the host's decoder; never owned
-    std::atomic<int32_t> volume;  // percent; 100 = unchanged; no range check
+    AudioDecoder* source;                              // the decoder, or the stage's own AudioEvenProcess
+    AudioDecoder* decoder;                             // the host's decoder; never owned
+    std::atomic<int32_t> volume;                       // percent; 100 = unchanged; no range check
     std::unique_ptr<STREAM_INFO::AUDIO> outputFormat;  // null = no conversion
     std::unique_ptr<STREAM_INFO> streamInfo;           // null = no conversion
     std::unique_ptr<CAudioConverter> converter;        // made on the first block

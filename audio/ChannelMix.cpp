@@ -10,17 +10,21 @@ namespace {
 
 constexpr int kHighest = 32767;
 
-constexpr int Pair(int inputChannels, int outputChannels)
-{
-    return inputChannels * 16 + outputChannels;
-}
+constexpr int Pair(int inputChannels, int outputChannels) { return inputChannels * 16 + outputChannels; }
 
 bool HasMixingRule(int inputChannels, int outputChannels)
 {
     switch (Pair(inputChannels, outputChannels)) {
-    case Pair(1, 2): case Pair(1, 6): case Pair(2, 1): case Pair(2, 6):
-    case Pair(6, 1): case Pair(6, 2): case Pair(7, 1): case Pair(7, 2):
-    case Pair(8, 1): case Pair(8, 2):
+    case Pair(1, 2):
+    case Pair(1, 6):
+    case Pair(2, 1):
+    case Pair(2, 6):
+    case Pair(6, 1):
+    case Pair(6, 2):
+    case Pair(7, 1):
+    case Pair(7, 2):
+    case Pair(8, 1):
+    case Pair(8, 2):
         return true;
     default:
         return false;
@@ -84,10 +88,7 @@ void MixFrame(const short* s, int inputChannels, int outputChannels, short* o)
 
 }  // namespace
 
-short ClampSample(int64_t value)
-{
-    return static_cast<short>(std::clamp<int64_t>(value, -kHighest, kHighest));
-}
+short ClampSample(int64_t value) { return static_cast<short>(std::clamp<int64_t>(value, -kHighest, kHighest)); }
 
 int64_t MixedSampleCount(int64_t count, int inputChannels, int outputChannels)
 {

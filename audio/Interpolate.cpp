@@ -22,10 +22,7 @@ Position PositionOf(int i, int n, int m)
     return Position{k, p - k};
 }
 
-int Step(int from, int to, double f)
-{
-    return static_cast<int>((to - from) * f);
-}
+int Step(int from, int to, double f) { return static_cast<int>((to - from) * f); }
 
 }  // namespace
 

@@ -32,16 +32,10 @@ void RunConverter(benchmark::State& state, int inChannels, int outChannels, int 
     state.SetBytesProcessed(state.iterations() * count * static_cast<int64_t>(sizeof(short)));
 }
 
-void BM_ConvertStereo44100To48000(benchmark::State& state)
-{
-    RunConverter(state, 2, 2, 44100, 48000);
-}
+void BM_ConvertStereo44100To48000(benchmark::State& state) { RunConverter(state, 2, 2, 44100, 48000); }
 BENCHMARK(BM_ConvertStereo44100To48000);
 
-void BM_ConvertSixChannelsToStereo(benchmark::State& state)
-{
-    RunConverter(state, 6, 2, 48000, 48000);
-}
+void BM_ConvertSixChannelsToStereo(benchmark::State& state) { RunConverter(state, 6, 2, 48000, 48000); }
 BENCHMARK(BM_ConvertSixChannelsToStereo);
 
 }  // namespace

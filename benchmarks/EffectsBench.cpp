@@ -54,10 +54,7 @@ void BM_DeinterlaceImage(benchmark::State& state)
 }
 BENCHMARK(BM_DeinterlaceImage)->Arg(DEINTERLACE_EVEN_DOUBLE)->Arg(DEINTERLACE_EVEN_INTERPOLATE);
 
-void BM_FilterEmboss(benchmark::State& state)
-{
-    OnFullHdFrame(state, FilterEmboss);
-}
+void BM_FilterEmboss(benchmark::State& state) { OnFullHdFrame(state, FilterEmboss); }
 BENCHMARK(BM_FilterEmboss);
 
 // A watermark a quarter of the picture wide and high, at the bottom right.

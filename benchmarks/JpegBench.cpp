@@ -74,8 +74,8 @@ void BM_JpegKernelsFullHd(benchmark::State& state)
     const auto transform = avpost::jpeg::PickTransformBlocks();
     for (auto _ : state) {
         for (size_t row = 0; row < kBlockRows; ++row) {
-            convert(picture.data() + row * 8 * 1920 * 3, 1920 * 3, kBlocks, samples[0].data(),
-                    samples[1].data(), samples[2].data());
+            convert(picture.data() + row * 8 * 1920 * 3, 1920 * 3, kBlocks, samples[0].data(), samples[1].data(),
+                    samples[2].data());
             for (auto& component : samples)
                 transform(component.data(), kBlocks, divisors.data(), coefficients.data(), nonzero.data());
         }

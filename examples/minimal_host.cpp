@@ -8,7 +8,11 @@
 // level is its number, as a camera or a file decoder might deliver them.
 class WobblingCamera : public VideoDecoder {
 public:
-    void Close() override { ReleaseYV12Frame(picture_); picture_ = nullptr; }
+    void Close() override
+    {
+        ReleaseYV12Frame(picture_);
+        picture_ = nullptr;
+    }
     int Open(const wchar_t*, const DecParam*, int*) override
     {
         info_.video.width = 320;
@@ -59,8 +63,8 @@ int main()
     int pictures = 0;
     do {
         const MEDIA_FRAME* picture = stage->GetFrame();
-        std::printf("%6.3f s  %dx%d  grey level %d\n", static_cast<double>(picture->startTime) / 1e7, picture->width, picture->height,
-                    picture->plane[0][picture->width * picture->height / 2]);
+        std::printf("%6.3f s  %dx%d  grey level %d\n", static_cast<double>(picture->startTime) / 1e7, picture->width,
+                    picture->height, picture->plane[0][picture->width * picture->height / 2]);
         ++pictures;
     } while (stage->Forward(1) >= 1);
 

@@ -49,9 +49,29 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
 
 std::vector<std::vector<uint8_t>> FuzzSeeds()
 {
-    return {Joined({"video", "in.mp4", "out.y4m", "--size", "1280x720", "--fps", "25", "--fit", "16:9", "--deinterlace",
-                    "even-average", "--filter", "sepia,negative", "--capture", "0:00:02.500=still.jpg", "--crop",
-                    "10:10:300:200", "--watermark", "logo.bmp", "--watermark-pos", "top-right", "--rotate", "auto"}),
+    return {Joined({"video",
+                    "in.mp4",
+                    "out.y4m",
+                    "--size",
+                    "1280x720",
+                    "--fps",
+                    "25",
+                    "--fit",
+                    "16:9",
+                    "--deinterlace",
+                    "even-average",
+                    "--filter",
+                    "sepia,negative",
+                    "--capture",
+                    "0:00:02.500=still.jpg",
+                    "--crop",
+                    "10:10:300:200",
+                    "--watermark",
+                    "logo.bmp",
+                    "--watermark-pos",
+                    "top-right",
+                    "--rotate",
+                    "auto"}),
             Joined({"audio", "in.wav", "-", "--rate", "44100", "--channels", "2", "--volume", "80", "--continuous"}),
             Joined({"demo", "folder"}), Joined({"gallery", "folder"}), Joined({"--help"})};
 }

@@ -17,7 +17,18 @@ constexpr int kMaxPictures = 24;
 constexpr int kMaxSteps = 48;
 constexpr int kMaxAspectTerm = 16;
 
-enum Step : uint8_t { kForward, kSeek, kBrightness, kContrast, kSaturation, kDeinterlace, kFlip, kFilter, kCrop, kStepCount };
+enum Step : uint8_t {
+    kForward,
+    kSeek,
+    kBrightness,
+    kContrast,
+    kSaturation,
+    kDeinterlace,
+    kFlip,
+    kFilter,
+    kCrop,
+    kStepCount
+};
 
 void ReadWhole(const MEDIA_FRAME* picture)
 {
@@ -97,8 +108,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
                                static_cast<IMAGE_INTERPOLATION>(input.InRange(-1, 4)),
                                static_cast<IMAGE_RESIZE_METHOD>(input.InRange(-1, 6))};
     const bool withRequest = input.Flag(), keepLast = input.Flag();
-    VideoDecoder* stage = process ? PCVideoInit(&source, withRequest ? &request : nullptr, rate, keepLast)
-                                  : PEVideoCreate(&source, rate);
+    VideoDecoder* stage =
+        process ? PCVideoInit(&source, withRequest ? &request : nullptr, rate, keepLast) : PEVideoCreate(&source, rate);
     if (stage == nullptr)
         return 0;
     ReadWhole(stage->GetFrame());
@@ -121,8 +132,8 @@ std::vector<std::vector<uint8_t>> FuzzSeeds()
     letterbox.Put<int64_t>(0).Put<int64_t>(0).PutInRange(16, 0).PutInRange(9, 0).Put<uint8_t>(7);
     letterbox.Put(30.0).Put<uint8_t>(1).PutInRange(40, 0).PutInRange(30, 0).PutInRange(2, -1).PutInRange(1, -1);
     letterbox.Put<uint8_t>(1).Put<uint8_t>(1);
-    const std::vector<std::pair<Step, int32_t>> steps = {
-        {kBrightness, 10}, {kContrast, 20}, {kSaturation, -30}, {kDeinterlace, 2}, {kFlip, 3}, {kFilter, 33}};
+    const std::vector<std::pair<Step, int32_t>> steps = {{kBrightness, 10}, {kContrast, 20}, {kSaturation, -30},
+                                                         {kDeinterlace, 2}, {kFlip, 3},      {kFilter, 33}};
     for (const auto& [step, value] : steps)
         letterbox.Put<uint8_t>(step).Put<int32_t>(value + (step == kDeinterlace ? 1 : 0));
     for (int i = 0; i < 4; ++i)

@@ -81,7 +81,8 @@ void Set(FuzzInput& input, VideoDecoder* stage)
         tagRECT rect{input.InRange(-200, 200), input.InRange(-200, 200), input.InRange(-200, 200),
                      input.InRange(-200, 200)};
         const bool withRect = input.Flag(), withBits = input.Flag();
-        PCSetWatermarkImage(stage, bitmap.info(), withBits ? bitmap.bits() : nullptr, withRect ? &rect : nullptr, level);
+        PCSetWatermarkImage(stage, bitmap.info(), withBits ? bitmap.bits() : nullptr, withRect ? &rect : nullptr,
+                            level);
         break;
     }
     case kFixedByAlign: {

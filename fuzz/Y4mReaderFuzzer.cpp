@@ -28,6 +28,6 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size)
 
 std::vector<std::vector<uint8_t>> FuzzSeeds()
 {
-    return {media_files::Y4m(8, 6, 3, " F25:1 Ip A1:1 C420jpeg"), media_files::Y4m(5, 3, 2, " F30000:1001 It C420mpeg2"),
-            media_files::Y4m(2, 2, 1, "")};
+    return {media_files::Y4m(8, 6, 3, " F25:1 Ip A1:1 C420jpeg"),
+            media_files::Y4m(5, 3, 2, " F30000:1001 It C420mpeg2"), media_files::Y4m(2, 2, 1, "")};
 }

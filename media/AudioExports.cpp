@@ -3,25 +3,16 @@
 #include "audio/AudioEvenProcess.h"
 #include "audio/AudioProcess.h"
 
-AudioDecoder* PEAudioCreate(AudioDecoder* source)
-{
-    return source != nullptr ? new AudioEvenProcess(source) : nullptr;
-}
+AudioDecoder* PEAudioCreate(AudioDecoder* source) { return source != nullptr ? new AudioEvenProcess(source) : nullptr; }
 
-void PEAudioDestroy(AudioDecoder* stage)
-{
-    delete stage;
-}
+void PEAudioDestroy(AudioDecoder* stage) { delete stage; }
 
 AudioDecoder* PCAudioInit(AudioDecoder* source, int sampleRate, int channels, int bitsPerSample, unsigned continuous)
 {
     return source != nullptr ? new AudioProcess(source, sampleRate, channels, bitsPerSample, continuous) : nullptr;
 }
 
-void PCAudioRelease(AudioDecoder* stage)
-{
-    delete stage;
-}
+void PCAudioRelease(AudioDecoder* stage) { delete stage; }
 
 void PCAudioSeek(AudioDecoder* stage, double seconds)
 {

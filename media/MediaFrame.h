@@ -24,9 +24,9 @@ struct MEDIA_FRAME {
         unsigned char* plane[4];  // Y, U (Cb), V (Cr), alpha or null
         __extension__ struct {
             alignas(void*) int32_t bitsPerSample;
-            unsigned char* data;               // interleaved samples
-            alignas(void*) int32_t dataSize;   // valid bytes in data
-            alignas(void*) int32_t bufferSize; // capacity of data in bytes
+            unsigned char* data;                // interleaved samples
+            alignas(void*) int32_t dataSize;    // valid bytes in data
+            alignas(void*) int32_t bufferSize;  // capacity of data in bytes
         };
     };
     int32_t width;

@@ -17,8 +17,8 @@ struct STREAM_INFO {
         int32_t height;
         double frameRate;  // frames per second; 0 = unknown
         int32_t reserved1[2];
-        int32_t aspectX;   // display aspect, horizontal term; 0 = none given
-        int32_t aspectY;   // display aspect, vertical term; 0 = none given
+        int32_t aspectX;  // display aspect, horizontal term; 0 = none given
+        int32_t aspectY;  // display aspect, vertical term; 0 = none given
         int32_t reserved2[3];
     } video;
     struct AUDIO {
@@ -39,10 +39,14 @@ struct STREAM_INFO {
 static_assert(sizeof(STREAM_INFO) == 1148, "STREAM_INFO is 1148 bytes");
 static_assert(sizeof(STREAM_INFO::VIDEO) == 44 && sizeof(STREAM_INFO::AUDIO) == 28, "sub-record sizes");
 static_assert(offsetof(STREAM_INFO, video) == 1036 && offsetof(STREAM_INFO, audio) == 1080, "STREAM_INFO layout");
-static_assert(offsetof(STREAM_INFO, video.frameRate) == 1044 && offsetof(STREAM_INFO, video.aspectX) == 1060, "STREAM_INFO layout");
-static_assert(offsetof(STREAM_INFO, video.aspectY) == 1064 && offsetof(STREAM_INFO, audio.reserved1) == 1096, "STREAM_INFO layout");
-static_assert(offsetof(STREAM_INFO, audio.reserved2) == 1104 && offsetof(STREAM_INFO, reserved) == 1108, "STREAM_INFO layout");
-static_assert(offsetof(STREAM_INFO, firstTime) == 1124 && offsetof(STREAM_INFO, startOffset) == 1132, "STREAM_INFO layout");
+static_assert(offsetof(STREAM_INFO, video.frameRate) == 1044 && offsetof(STREAM_INFO, video.aspectX) == 1060,
+              "STREAM_INFO layout");
+static_assert(offsetof(STREAM_INFO, video.aspectY) == 1064 && offsetof(STREAM_INFO, audio.reserved1) == 1096,
+              "STREAM_INFO layout");
+static_assert(offsetof(STREAM_INFO, audio.reserved2) == 1104 && offsetof(STREAM_INFO, reserved) == 1108,
+              "STREAM_INFO layout");
+static_assert(offsetof(STREAM_INFO, firstTime) == 1124 && offsetof(STREAM_INFO, startOffset) == 1132,
+              "STREAM_INFO layout");
 static_assert(offsetof(STREAM_INFO, tail) == 1140, "STREAM_INFO layout");
 
 // Decode parameters a host passes to its decoder's Open. The library only passes the

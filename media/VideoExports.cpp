@@ -12,10 +12,7 @@ using avpost::detail::StoreSetting;
 
 // The stage behind a handle from PCVideoInit; null for null and for any other kind of stage,
 // so a wrong handle is ignored instead of being written through.
-VideoProcess* AsVideoProcess(VideoDecoder* stage)
-{
-    return dynamic_cast<VideoProcess*>(stage);
-}
+VideoProcess* AsVideoProcess(VideoDecoder* stage) { return dynamic_cast<VideoProcess*>(stage); }
 
 }  // namespace
 
@@ -29,10 +26,7 @@ VideoDecoder* PEVideoCreate(VideoDecoder* source, double frameRate)
     return stage.release();
 }
 
-void PEVideoDestroy(VideoDecoder* stage)
-{
-    delete stage;
-}
+void PEVideoDestroy(VideoDecoder* stage) { delete stage; }
 
 VideoDecoder* PCVideoInit(VideoDecoder* source, const RESIZE_PARAM* request, double frameRate, bool keepLastFrame)
 {
@@ -41,10 +35,7 @@ VideoDecoder* PCVideoInit(VideoDecoder* source, const RESIZE_PARAM* request, dou
     return new VideoProcess(source, request, frameRate, keepLastFrame);
 }
 
-void PCVideoRelease(VideoDecoder* stage)
-{
-    delete stage;
-}
+void PCVideoRelease(VideoDecoder* stage) { delete stage; }
 
 void PCVideoSeek(VideoDecoder* stage, double seconds, unsigned flags)
 {
@@ -112,8 +103,8 @@ void PCSetWatermarkImageAlign(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsign
         process->SetWatermarkImageAlign(bitmap, bits, align, level);
 }
 
-void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagFRECT* rect,
-                             int level, int conversionFlag)
+void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagFRECT* rect, int level,
+                             int conversionFlag)
 {
     if (VideoProcess* process = AsVideoProcess(stage))
         process->SetUserWatermarkImage(bitmap, bits, rect, level, conversionFlag);

@@ -45,8 +45,8 @@ AVPOST_API void PCSetWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, 
                                     int level);
 AVPOST_API void PCSetWatermarkImageAlign(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, int align,
                                          int level);
-AVPOST_API void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits,
-                                        tagFRECT* rect, int level, int conversionFlag);
+AVPOST_API void PCSetUserWatermarkImage(VideoDecoder* stage, tagBITMAPINFO* bitmap, unsigned char* bits, tagFRECT* rect,
+                                        int level, int conversionFlag);
 AVPOST_API void PCSetWatermarkSrcID(VideoDecoder* stage, void* module, const wchar_t* id, tagRECT* rect, int level);
 AVPOST_API void PCSetWatermarkSrcIDAlign(VideoDecoder* stage, void* module, const wchar_t* id, int align, int level);
 

@@ -63,9 +63,6 @@ ScopedLevel::ScopedLevel(Level level) : previous_(pinned.load())
     pinned.store(static_cast<int>(allowed));
 }
 
-ScopedLevel::~ScopedLevel()
-{
-    pinned.store(previous_);
-}
+ScopedLevel::~ScopedLevel() { pinned.store(previous_); }
 
 }  // namespace avpost::simd

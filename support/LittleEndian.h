@@ -7,15 +7,9 @@
 // the machine reading or writing them.
 namespace avpost::detail {
 
-inline uint16_t ReadLe16(const unsigned char* bytes)
-{
-    return static_cast<uint16_t>(bytes[0] | bytes[1] << 8);
-}
+inline uint16_t ReadLe16(const unsigned char* bytes) { return static_cast<uint16_t>(bytes[0] | bytes[1] << 8); }
 
-inline uint32_t ReadLe32(const unsigned char* bytes)
-{
-    return ReadLe16(bytes) | uint32_t{ReadLe16(bytes + 2)} << 16;
-}
+inline uint32_t ReadLe32(const unsigned char* bytes) { return ReadLe16(bytes) | uint32_t{ReadLe16(bytes + 2)} << 16; }
 
 // Stores the low 16 bits of value.
 inline void StoreLe16(unsigned char* bytes, uint32_t value)

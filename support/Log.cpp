@@ -57,8 +57,8 @@ void* LogGetAddress(const char* name)
     if (byName)
         avpost::detail::TraceLine("dyLog: LogGetAddress [%s] [0x%" PRIxPTR "] error.\r\n", name, handleValue);
     else
-        avpost::detail::TraceLine("dyLog: LogGetAddress [%d] [0x%" PRIxPTR "] error.\r\n",
-                                  static_cast<int>(nameValue), handleValue);
+        avpost::detail::TraceLine("dyLog: LogGetAddress [%d] [0x%" PRIxPTR "] error.\r\n", static_cast<int>(nameValue),
+                                  handleValue);
     return nullptr;
 }
 

@@ -24,8 +24,8 @@ enum class ConversionFlags : int32_t {
 
 // Converts the code points of [source, sourceEnd) into bytes from target on, never writing at
 // or beyond targetEnd. The caller learns neither how much was read nor how much was written.
-AVPOST_API int ConvertUTF32toUTF8(const unsigned long* source, const unsigned long* sourceEnd,
-                                  unsigned char* target, unsigned char* targetEnd, ConversionFlags flags);
+AVPOST_API int ConvertUTF32toUTF8(const unsigned long* source, const unsigned long* sourceEnd, unsigned char* target,
+                                  unsigned char* targetEnd, ConversionFlags flags);
 
 // Converts length wide characters of text, or the whole string and its terminating zero when
 // length is -1, into buffer (bufferSize bytes). A null text gives 3; any other negative length

@@ -36,10 +36,7 @@ void FillAround(unsigned char* plane, int32_t pitch, int32_t rows, const PlaneAr
 
 }  // namespace
 
-void ClearToBlack(MEDIA_FRAME& frame)
-{
-    ClearAround(frame, YuvCoverage{false, 0, 0, {0, 0, 0, 0}});
-}
+void ClearToBlack(MEDIA_FRAME& frame) { ClearAround(frame, YuvCoverage{false, 0, 0, {0, 0, 0, 0}}); }
 
 void ClearAround(MEDIA_FRAME& frame, const YuvCoverage& drawn)
 {

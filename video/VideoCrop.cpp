@@ -50,8 +50,8 @@ void VideoProcess::MakeCropImage() const
     // what lies inside it.
     const tagRECT crop = *cropRect;
     const int64_t cropWidth = int64_t{crop.right} - crop.left;
-    const int32_t rows = Clamped(outputFormat->height, 0,
-                                 std::min<int64_t>(outputFrame->height, int64_t{picture->height} - crop.top));
+    const int32_t rows =
+        Clamped(outputFormat->height, 0, std::min<int64_t>(outputFrame->height, int64_t{picture->height} - crop.top));
     const int32_t lumaBytes =
         Clamped(cropWidth, 0, std::min<int64_t>(outputFrame->width, int64_t{picture->width} - crop.left));
     if (rows == 0 || lumaBytes == 0)
@@ -68,8 +68,8 @@ void VideoProcess::MakeCropImage() const
         return;
     for (int plane = 1; plane <= 2; ++plane) {
         CopyRows(outputFrame->plane[plane], dstChromaWidth,
-                 picture->plane[plane] + ptrdiff_t{chromaTop} * srcChromaWidth + chromaLeft, srcChromaWidth,
-                 chromaRows, chromaBytes);
+                 picture->plane[plane] + ptrdiff_t{chromaTop} * srcChromaWidth + chromaLeft, srcChromaWidth, chromaRows,
+                 chromaBytes);
     }
 }
 
@@ -132,8 +132,8 @@ void VideoProcess::SetCropRect(const tagRECT* rect)
             outputFormat->height = size.cy;
             Describe(dstParam, size.cx, size.cy, tagRECT{0, 0, size.cx, size.cy});
         } else {
-            CalcResizeParam(srcParam, dstParam, sourceVideo.aspectX, sourceVideo.aspectY, width, height,
-                            &geometryCrop, base.cx, base.cy, method);
+            CalcResizeParam(srcParam, dstParam, sourceVideo.aspectX, sourceVideo.aspectY, width, height, &geometryCrop,
+                            base.cx, base.cy, method);
         }
     }
     streamInfo->video = *outputFormat;

@@ -17,8 +17,7 @@ constexpr double kFallbackRate = 30.0;
 }  // namespace
 
 VideoEvenProcess::VideoEvenProcess(VideoDecoder* src, double rate)
-    : source(src), frameRate(rate), position(0), frame(), current(nullptr), sourceFrame(nullptr),
-      streamInfo(nullptr)
+    : source(src), frameRate(rate), position(0), frame(), current(nullptr), sourceFrame(nullptr), streamInfo(nullptr)
 {
     if (source == nullptr)
         return;
@@ -45,10 +44,7 @@ VideoEvenProcess::VideoEvenProcess(VideoDecoder* src, double rate)
     current = &frame;
 }
 
-VideoEvenProcess::~VideoEvenProcess()
-{
-    delete streamInfo;
-}
+VideoEvenProcess::~VideoEvenProcess() { delete streamInfo; }
 
 void VideoEvenProcess::Close()
 {
@@ -56,25 +52,13 @@ void VideoEvenProcess::Close()
     streamInfo = nullptr;
 }
 
-int VideoEvenProcess::Open(const wchar_t*, const DecParam*, int*)
-{
-    return 1;
-}
+int VideoEvenProcess::Open(const wchar_t*, const DecParam*, int*) { return 1; }
 
-int VideoEvenProcess::SetExDecodeParam(unsigned, unsigned, unsigned)
-{
-    return 0;
-}
+int VideoEvenProcess::SetExDecodeParam(unsigned, unsigned, unsigned) { return 0; }
 
-const STREAM_INFO* VideoEvenProcess::GetStreamInfo() const
-{
-    return source != nullptr ? streamInfo : nullptr;
-}
+const STREAM_INFO* VideoEvenProcess::GetStreamInfo() const { return source != nullptr ? streamInfo : nullptr; }
 
-bool VideoEvenProcess::IsRunnable() const
-{
-    return source != nullptr && streamInfo != nullptr && frameRate > 0.0;
-}
+bool VideoEvenProcess::IsRunnable() const { return source != nullptr && streamInfo != nullptr && frameRate > 0.0; }
 
 int64_t VideoEvenProcess::SourcePosition(const MEDIA_FRAME& picture) const
 {
@@ -145,8 +129,8 @@ double VideoEvenProcess::Seek(double seconds, unsigned flags)
         position = TruncSaturate<int32_t>(t * frameRate + 0.5);
         return static_cast<double>(TickTime(position)) / kUnitsPerSecond;
     }
-    position = TruncSaturate<int32_t>(static_cast<double>(SourcePosition(*sourceFrame)) / kUnitsPerSecond *
-                                      frameRate + 0.5);
+    position =
+        TruncSaturate<int32_t>(static_cast<double>(SourcePosition(*sourceFrame)) / kUnitsPerSecond * frameRate + 0.5);
     const int64_t ts = TickTime(position);
     HandOut(ts);
     return static_cast<double>(ts) / kUnitsPerSecond;
@@ -159,7 +143,4 @@ double VideoEvenProcess::GetOffset() const
     return position / frameRate;
 }
 
-MEDIA_FRAME* VideoEvenProcess::GetFrame() const
-{
-    return current;
-}
+MEDIA_FRAME* VideoEvenProcess::GetFrame() const { return current; }

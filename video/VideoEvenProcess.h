@@ -35,11 +35,11 @@ public:
 
     VideoDecoder* source;
     double frameRate;
-    int32_t position;         // output ticks since the start or the last seek
-    MEDIA_FRAME frame;        // the source's picture record with this stage's times
-    MEDIA_FRAME* current;     // &frame, or null when there is no picture
-    MEDIA_FRAME* sourceFrame; // the source's picture as last returned by source->GetFrame()
-    STREAM_INFO* streamInfo;  // owned copy of the source's record with this stage's rate
+    int32_t position;          // output ticks since the start or the last seek
+    MEDIA_FRAME frame;         // the source's picture record with this stage's times
+    MEDIA_FRAME* current;      // &frame, or null when there is no picture
+    MEDIA_FRAME* sourceFrame;  // the source's picture as last returned by source->GetFrame()
+    STREAM_INFO* streamInfo;   // owned copy of the source's record with this stage's rate
 
 private:
     int64_t SourcePosition(const MEDIA_FRAME& picture) const;

@@ -52,8 +52,8 @@ bool IsReadable(const MEDIA_FRAME* picture)
 // written outside its planes, so a rectangle is used only when it lies inside its picture.
 bool Contains(const MEDIA_FRAME& picture, const IMG_PARAM& rect)
 {
-    return rect.x >= 0 && rect.y >= 0 && rect.cx >= 1 && rect.cy >= 1 &&
-           int64_t{rect.x} + rect.cx <= picture.width && int64_t{rect.y} + rect.cy <= picture.height;
+    return rect.x >= 0 && rect.y >= 0 && rect.cx >= 1 && rect.cy >= 1 && int64_t{rect.x} + rect.cx <= picture.width &&
+           int64_t{rect.y} + rect.cy <= picture.height;
 }
 
 bool HasSize(const MEDIA_FRAME* frame, int64_t width, int64_t height)
@@ -262,8 +262,8 @@ void VideoProcess::BlendUserWatermark() const
     if (!HasSize(mark, placedWidth, placedHeight)) {
         if (!CanScaleWatermark(*mark, placedWidth, placedHeight))
             return;
-        if (EnsureFrame(userWatermarkCache, static_cast<int32_t>(placedWidth), static_cast<int32_t>(placedHeight),
-                        true, true))
+        if (EnsureFrame(userWatermarkCache, static_cast<int32_t>(placedWidth), static_cast<int32_t>(placedHeight), true,
+                        true))
             ImageResizeYUV_Ex(userWatermarkFrame, userWatermarkCache, INTERPOLATION_BILINEAR);
         mark = userWatermarkCache;
     }

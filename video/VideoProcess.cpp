@@ -69,8 +69,8 @@ VideoProcess::VideoProcess(VideoDecoder* src, const RESIZE_PARAM* request, doubl
       contrast(0), saturation(0), watermarkFrame(nullptr), watermarkEnabled(1), filterFlags(0), flipFlags(0),
       watermarkRect(nullptr), watermarkLevel(kFullLevel), watermarkAlign(0), userWatermarkFrame(nullptr),
       userWatermarkCache(nullptr), userWatermarkLevel(kFullLevel), userWatermarkRect(nullptr), outputFrame(nullptr),
-      deinterlaceFrame(nullptr), retiredFrame(nullptr), cropRect(nullptr), resizeParam(nullptr), srcParam(),
-      dstParam(), mutex(), deinterlaceStyle(DEINTERLACE_NONE), lastFrame(nullptr), keepLastFrame(keep)
+      deinterlaceFrame(nullptr), retiredFrame(nullptr), cropRect(nullptr), resizeParam(nullptr), srcParam(), dstParam(),
+      mutex(), deinterlaceStyle(DEINTERLACE_NONE), lastFrame(nullptr), keepLastFrame(keep)
 {
     // A source without stream information leaves an inert stage with an all-zero format.
     const STREAM_INFO* info = source != nullptr ? source->GetStreamInfo() : nullptr;
@@ -141,55 +141,31 @@ void VideoProcess::Close()
     Release(lastFrame);
 }
 
-int VideoProcess::Open(const wchar_t*, const DecParam*, int*)
-{
-    return 1;
-}
+int VideoProcess::Open(const wchar_t*, const DecParam*, int*) { return 1; }
 
 int VideoProcess::SetExDecodeParam(unsigned a, unsigned b, unsigned c)
 {
     return input != nullptr ? input->SetExDecodeParam(a, b, c) : 0;
 }
 
-const STREAM_INFO* VideoProcess::GetStreamInfo() const
-{
-    return streamInfo;
-}
+const STREAM_INFO* VideoProcess::GetStreamInfo() const { return streamInfo; }
 
 double VideoProcess::Seek(double seconds, unsigned flags)
 {
     return input != nullptr ? input->Seek(seconds, flags) : 0.0;
 }
 
-double VideoProcess::GetOffset() const
-{
-    return input != nullptr ? input->GetOffset() : 0.0;
-}
+double VideoProcess::GetOffset() const { return input != nullptr ? input->GetOffset() : 0.0; }
 
-int VideoProcess::Forward(int count)
-{
-    return input != nullptr ? input->Forward(count) : 0;
-}
+int VideoProcess::Forward(int count) { return input != nullptr ? input->Forward(count) : 0; }
 
-void VideoProcess::SetExFilterFlag(unsigned flags)
-{
-    StoreSetting(filterFlags, uint32_t{flags});
-}
+void VideoProcess::SetExFilterFlag(unsigned flags) { StoreSetting(filterFlags, uint32_t{flags}); }
 
-void VideoProcess::SetFlipFlag(unsigned flags)
-{
-    StoreSetting(flipFlags, uint32_t{flags});
-}
+void VideoProcess::SetFlipFlag(unsigned flags) { StoreSetting(flipFlags, uint32_t{flags}); }
 
-void VideoProcess::SetDeintelace(DEINTERLACE_STYLE style)
-{
-    StoreSetting(deinterlaceStyle, style);
-}
+void VideoProcess::SetDeintelace(DEINTERLACE_STYLE style) { StoreSetting(deinterlaceStyle, style); }
 
-void VideoProcess::DisableWatermark(unsigned disable)
-{
-    StoreSetting(watermarkEnabled, int32_t{disable == 0 ? 1 : 0});
-}
+void VideoProcess::DisableWatermark(unsigned disable) { StoreSetting(watermarkEnabled, int32_t{disable == 0 ? 1 : 0}); }
 
 MEDIA_FRAME* VideoProcess::PrepareMemImage(int width, int height) const
 {

@@ -86,22 +86,22 @@ public:
     void SetCropRect(const tagRECT* rect);
 
     VideoDecoder* source;
-    VideoDecoder* input;                    // source, or an owned VideoEvenProcess over it
-    STREAM_INFO::VIDEO* outputFormat;       // owned
-    const STREAM_INFO::VIDEO* sourceFormat; // inside the source's record
-    STREAM_INFO* streamInfo;                // owned; video equals *outputFormat
+    VideoDecoder* input;                     // source, or an owned VideoEvenProcess over it
+    STREAM_INFO::VIDEO* outputFormat;        // owned
+    const STREAM_INFO::VIDEO* sourceFormat;  // inside the source's record
+    STREAM_INFO* streamInfo;                 // owned; video equals *outputFormat
     int32_t brightness;
     int32_t contrast;
     int32_t saturation;
-    MEDIA_FRAME* watermarkFrame;            // owned
+    MEDIA_FRAME* watermarkFrame;  // owned
     int32_t watermarkEnabled;
     uint32_t filterFlags;
     uint32_t flipFlags;
-    tagRECT* watermarkRect;                 // owned; output pixels, moved by the crop
+    tagRECT* watermarkRect;  // owned; output pixels, moved by the crop
     int32_t watermarkLevel;
     int32_t watermarkAlign;
-    MEDIA_FRAME* userWatermarkFrame;        // owned
-    mutable MEDIA_FRAME* userWatermarkCache; // owned; userWatermarkFrame at its placed size
+    MEDIA_FRAME* userWatermarkFrame;          // owned
+    mutable MEDIA_FRAME* userWatermarkCache;  // owned; userWatermarkFrame at its placed size
     int32_t userWatermarkLevel;
     tagFRECT* userWatermarkRect;            // owned; fractions of the output size
     mutable MEDIA_FRAME* outputFrame;       // owned
@@ -113,7 +113,7 @@ public:
     mutable IMG_PARAM dstParam;
     mutable pthread_mutex_t mutex;
     DEINTERLACE_STYLE deinterlaceStyle;
-    mutable MEDIA_FRAME* lastFrame;         // owned; copy of the input's last picture
+    mutable MEDIA_FRAME* lastFrame;  // owned; copy of the input's last picture
     bool keepLastFrame;
 
 private:

@@ -11,15 +11,9 @@
 // Small pieces shared by the translation units of VideoProcess.
 namespace avpost::detail {
 
-inline int32_t ChromaSize(int32_t lumaSize)
-{
-    return static_cast<int32_t>((int64_t{lumaSize} + 1) / 2);
-}
+inline int32_t ChromaSize(int32_t lumaSize) { return static_cast<int32_t>((int64_t{lumaSize} + 1) / 2); }
 
-inline bool HasAspect(int32_t aspectX, int32_t aspectY)
-{
-    return aspectX != 0 && aspectY != 0;
-}
+inline bool HasAspect(int32_t aspectX, int32_t aspectY) { return aspectX != 0 && aspectY != 0; }
 
 // Releases an owned frame and forgets it.
 inline void Release(MEDIA_FRAME*& frame)

@@ -37,15 +37,9 @@ inline unsigned char ChromaOf4(int a, int b, int c, int d)
     return static_cast<unsigned char>((a + b + c + d + 512) >> 2);
 }
 
-inline unsigned char ChromaOf2(int a, int b)
-{
-    return static_cast<unsigned char>((a + b + 256) >> 1);
-}
+inline unsigned char ChromaOf2(int a, int b) { return static_cast<unsigned char>((a + b + 256) >> 1); }
 
-inline unsigned char ChromaOf1(int a)
-{
-    return static_cast<unsigned char>(a + 128);
-}
+inline unsigned char ChromaOf1(int a) { return static_cast<unsigned char>(a + 128); }
 
 // Table path, YUV to RGB (13-bit fixed point): the parts of B, G and R that depend on the chroma
 // pair only, computed once per chroma sample.
@@ -79,10 +73,7 @@ inline void TableYuvToBgr(int y, const ChromaTerms& t, unsigned char* bgr)
 }
 
 // Per-pixel path (10-bit fixed point); the constants fold the bias and a rounding half together.
-inline int Clamp(int value, int low, int high)
-{
-    return value < low ? low : (value > high ? high : value);
-}
+inline int Clamp(int value, int low, int high) { return value < low ? low : (value > high ? high : value); }
 
 inline void PixelRgbToYuv(int r, int g, int b, int& y, int& u, int& v)
 {

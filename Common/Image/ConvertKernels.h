@@ -33,10 +33,7 @@ struct PackedRows {
     unsigned char* Row(int row) const { return first + row * step; }
 };
 
-inline PackedRows TopDownRows(unsigned char* bits, ptrdiff_t stride)
-{
-    return PackedRows{bits, stride};
-}
+inline PackedRows TopDownRows(unsigned char* bits, ptrdiff_t stride) { return PackedRows{bits, stride}; }
 
 inline PackedRows BottomUpRows(unsigned char* bits, ptrdiff_t stride, int height)
 {

@@ -3,16 +3,16 @@
 // Each table holds K * i for i = 0...255, spelled out by the preprocessor so that the tables are
 // constant data from the start and no converter depends on start-up order.
 #define AVPOST_MULTIPLES_4(k, i) (k) * ((i) + 0), (k) * ((i) + 1), (k) * ((i) + 2), (k) * ((i) + 3)
-#define AVPOST_MULTIPLES_16(k, i) \
+#define AVPOST_MULTIPLES_16(k, i)                                                                   \
     AVPOST_MULTIPLES_4(k, (i) + 0), AVPOST_MULTIPLES_4(k, (i) + 4), AVPOST_MULTIPLES_4(k, (i) + 8), \
         AVPOST_MULTIPLES_4(k, (i) + 12)
-#define AVPOST_MULTIPLES_64(k, i) \
+#define AVPOST_MULTIPLES_64(k, i)                                                                        \
     AVPOST_MULTIPLES_16(k, (i) + 0), AVPOST_MULTIPLES_16(k, (i) + 16), AVPOST_MULTIPLES_16(k, (i) + 32), \
         AVPOST_MULTIPLES_16(k, (i) + 48)
-#define AVPOST_MULTIPLES_256(k) \
-    { \
+#define AVPOST_MULTIPLES_256(k)                                                             \
+    {                                                                                       \
         AVPOST_MULTIPLES_64(k, 0), AVPOST_MULTIPLES_64(k, 64), AVPOST_MULTIPLES_64(k, 128), \
-            AVPOST_MULTIPLES_64(k, 192) \
+            AVPOST_MULTIPLES_64(k, 192)                                                     \
     }
 
 const int mul_8258[256] = AVPOST_MULTIPLES_256(8258);

@@ -34,10 +34,7 @@ ptrdiff_t BitmapStride(int width, int bitsPerPixel)
     return static_cast<ptrdiff_t>(width) * 4;
 }
 
-bool HasPixels(const tagBITMAPINFOHEADER& header)
-{
-    return header.biWidth > 0 && header.biHeight > 0;
-}
+bool HasPixels(const tagBITMAPINFOHEADER& header) { return header.biWidth > 0 && header.biHeight > 0; }
 
 PackedRows BitmapRows(const tagBITMAPINFOHEADER& header, unsigned char* bits, int bitsPerPixel, bool bottomUp)
 {
@@ -46,16 +43,16 @@ PackedRows BitmapRows(const tagBITMAPINFOHEADER& header, unsigned char* bits, in
                     : avpost::detail::TopDownRows(bits, stride);
 }
 
-void RgbBitmapToYuv(const PlanarPicture& dst, const tagBITMAPINFOHEADER& header, unsigned char* bits,
-                    int bitsPerPixel, bool bottomUp)
+void RgbBitmapToYuv(const PlanarPicture& dst, const tagBITMAPINFOHEADER& header, unsigned char* bits, int bitsPerPixel,
+                    bool bottomUp)
 {
     if (HasPixels(header))
         avpost::detail::RgbToYuv420(dst, BitmapRows(header, bits, bitsPerPixel, bottomUp), header.biWidth,
                                     header.biHeight, bitsPerPixel / 8);
 }
 
-void YuvToRgbBitmap(const tagBITMAPINFOHEADER& header, unsigned char* bits, const PlanarPicture& src,
-                    int bitsPerPixel, bool bottomUp, FourthByte fourth)
+void YuvToRgbBitmap(const tagBITMAPINFOHEADER& header, unsigned char* bits, const PlanarPicture& src, int bitsPerPixel,
+                    bool bottomUp, FourthByte fourth)
 {
     if (HasPixels(header))
         avpost::detail::Yuv420ToRgb(BitmapRows(header, bits, bitsPerPixel, bottomUp), src, header.biWidth,
@@ -70,8 +67,8 @@ void CheckRgb32Source(const tagBITMAPINFOHEADER* lpSrcBmi, const unsigned char* 
     AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
 }
 
-void CheckRgb32Destination(const tagBITMAPINFOHEADER* lpDstBmi, const unsigned char* lpDstBits,
-                           const unsigned char* pY, const unsigned char* pU, const unsigned char* pV)
+void CheckRgb32Destination(const tagBITMAPINFOHEADER* lpDstBmi, const unsigned char* lpDstBits, const unsigned char* pY,
+                           const unsigned char* pU, const unsigned char* pV)
 {
     AVPOST_CONVERT_CHECK(lpDstBmi && lpDstBmi->biBitCount == 32);
     AVPOST_CONVERT_CHECK(lpDstBits && pY && pU && pV);
@@ -139,8 +136,8 @@ void Yuv420_2_rgb32(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, uns
                    FourthByte::Keep);
 }
 
-void Yuv420_2_rgb24Simple(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, unsigned char* pY,
-                          unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV)
+void Yuv420_2_rgb24Simple(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, unsigned char* pY, unsigned char* pU,
+                          unsigned char* pV, int nPitchY, int nPitchU, int nPitchV)
 {
     if (AnyNull(lpDstBmi, lpDstBits, pY, pU, pV) || !HasPixels(*lpDstBmi))
         return;
@@ -149,15 +146,9 @@ void Yuv420_2_rgb24Simple(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBit
                                         lpDstBmi->biHeight);
 }
 
-void PixelRGB_2_YUV(int R, int G, int B, int& Y, int& U, int& V)
-{
-    avpost::detail::PixelRgbToYuv(R, G, B, Y, U, V);
-}
+void PixelRGB_2_YUV(int R, int G, int B, int& Y, int& U, int& V) { avpost::detail::PixelRgbToYuv(R, G, B, Y, U, V); }
 
-void PixelYUV_2_RGB(int Y, int U, int V, int& R, int& G, int& B)
-{
-    avpost::detail::PixelYuvToRgb(Y, U, V, R, G, B);
-}
+void PixelYUV_2_RGB(int Y, int U, int V, int& R, int& G, int& B) { avpost::detail::PixelYuvToRgb(Y, U, V, R, G, B); }
 
 void Argb_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
                    tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits)
@@ -166,8 +157,8 @@ void Argb_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int 
     RgbBitmapToYuv(Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), *lpSrcBmi, lpSrcBits, 32, false);
 }
 
-void Rgb32_2_yuv420_Ex(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
-                       int nPitchV, unsigned char* lpSrcBits, int nWidth, int nHeight, int nPitchSrc)
+void Rgb32_2_yuv420_Ex(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
+                       unsigned char* lpSrcBits, int nWidth, int nHeight, int nPitchSrc)
 {
     AVPOST_CONVERT_CHECK(lpSrcBits && pY && pU && pV);
     // INT_MIN rows cannot be negated, and no such picture fits in memory.
@@ -180,8 +171,7 @@ void Rgb32_2_yuv420_Ex(unsigned char* pY, unsigned char* pU, unsigned char* pV, 
 }
 
 void Rgb32_2_yuv420A(unsigned char* pY, unsigned char* pU, unsigned char* pV, unsigned char* pA, int nPitchY,
-                     int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits,
-                     int bBottomUp)
+                     int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits, int bBottomUp)
 {
     if (bBottomUp != 0) {
         Rgb32_2_yuv420A_R(pY, pU, pV, pA, nPitchY, nPitchU, nPitchV, lpSrcBmi, lpSrcBits);
@@ -217,8 +207,8 @@ void YUY2_2_Yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int 
     // The bound applies to every V sample written; checking the highest one up front keeps the
     // destination untouched when it fails.
     const uintptr_t highestV = HighestChromaAddress(pV, nPitchV, xDst, yDst, cx, cy);
-    const uintptr_t bound = reinterpret_cast<uintptr_t>(pV) +
-                            static_cast<uintptr_t>((static_cast<int64_t>(ySrc) + cy) * nPitchV);
+    const uintptr_t bound =
+        reinterpret_cast<uintptr_t>(pV) + static_cast<uintptr_t>((static_cast<int64_t>(ySrc) + cy) * nPitchV);
     AVPOST_CONVERT_CHECK_AS(highestV <= bound, "(char*)V <= ((char*)pV + (ySrc + cy) * nPt_V)");
     const PlanarRect dst{Planes(pY, pU, pV, nullptr, nPitchY, nPitchU, nPitchV), xDst, yDst};
     avpost::detail::PackedToPlanar(dst, PackedRect{lpBitsSrc, nPitchSrc, xSrc, ySrc, bYUY2}, cx, cy);
@@ -244,8 +234,8 @@ void YUY2_2_Rgb24(unsigned char* lpBitsDst, int nHeightDst, int nPitchDst, int x
                                   PackedRect{lpBitsSrc, nPitchSrc, xSrc, ySrc, bYUY2}, cxDst, cyDst);
 }
 
-void Rgb24_2_YUY2(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cxDst, int cyDst,
-                  unsigned int bYUY2, unsigned char* lpBitsSrc, int nHeightSrc, int nPitchSrc, int xSrc, int ySrc)
+void Rgb24_2_YUY2(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cxDst, int cyDst, unsigned int bYUY2,
+                  unsigned char* lpBitsSrc, int nHeightSrc, int nPitchSrc, int xSrc, int ySrc)
 {
     AVPOST_CONVERT_CHECK(lpBitsDst && lpBitsSrc);
     AVPOST_CONVERT_CHECK_AS((static_cast<int64_t>(xDst) + cxDst) * 2 <= nPitchDst, "(xDst + cxDst) * 2 <= nPitchDst");
@@ -267,9 +257,8 @@ void YV12_Blt_fast(unsigned char* pYDst, unsigned char* pUDst, unsigned char* pV
     avpost::detail::CopyPlanarRect(dst, src, cx, cy);
 }
 
-void YUY2_Blt_fast(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cx, int cy,
-                   unsigned int bYUY2Dst, unsigned char* lpBitsSrc, int nPitchSrc, unsigned int bYUY2Src, int xSrc,
-                   int ySrc)
+void YUY2_Blt_fast(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cx, int cy, unsigned int bYUY2Dst,
+                   unsigned char* lpBitsSrc, int nPitchSrc, unsigned int bYUY2Src, int xSrc, int ySrc)
 {
     if (cx <= 0 || cy <= 0)
         return;

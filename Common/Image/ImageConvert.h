@@ -37,9 +37,8 @@ AVPOST_API void Rgb32_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned ch
                                int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits);
 // Bottom-up 24-bit bitmap through PixelRGB_2_YUV; converts the even part only (an odd last column
 // or row of the planes is left as it was). Null pointers convert nothing.
-AVPOST_API void Rgb24_2_yuv420Simple(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY,
-                                     int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi,
-                                     unsigned char* lpSrcBits);
+AVPOST_API void Rgb24_2_yuv420Simple(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
+                                     int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits);
 
 // Planar YUV 4:2:0 to a bottom-up 24-bit bitmap, 13-bit fixed point; row padding is never written.
 AVPOST_API void Yuv420_2_rgb24(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDstBits, unsigned char* pY,
@@ -62,16 +61,15 @@ AVPOST_API void Argb_2_yuv420(unsigned char* pY, unsigned char* pU, unsigned cha
                               int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits);
 // 32-bit pixels of explicit geometry: nWidth pixels per row, rows nPitchSrc bytes apart, top-down
 // when nHeight >= 0 and bottom-up with -nHeight rows when nHeight < 0.
-AVPOST_API void Rgb32_2_yuv420_Ex(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY,
-                                  int nPitchU, int nPitchV, unsigned char* lpSrcBits, int nWidth, int nHeight,
-                                  int nPitchSrc);
+AVPOST_API void Rgb32_2_yuv420_Ex(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
+                                  int nPitchV, unsigned char* lpSrcBits, int nWidth, int nHeight, int nPitchSrc);
 // 32-bit bitmap to planar YUV 4:2:0 plus an alpha plane (the fourth bytes, rows nPitchY apart).
 // bBottomUp != 0 is exactly Rgb32_2_yuv420A_R; bBottomUp == 0 reads top-down rows, checks neither
 // the bit count nor the pointers, and converts nothing when a pointer it needs is null.
 // A null pA skips the alpha plane.
-AVPOST_API void Rgb32_2_yuv420A(unsigned char* pY, unsigned char* pU, unsigned char* pV, unsigned char* pA,
-                                int nPitchY, int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi,
-                                unsigned char* lpSrcBits, int bBottomUp);
+AVPOST_API void Rgb32_2_yuv420A(unsigned char* pY, unsigned char* pU, unsigned char* pV, unsigned char* pA, int nPitchY,
+                                int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi, unsigned char* lpSrcBits,
+                                int bBottomUp);
 // Bottom-up 32-bit bitmap to planar YUV 4:2:0 plus an alpha plane; a null pA skips the alpha plane.
 AVPOST_API void Rgb32_2_yuv420A_R(unsigned char* pY, unsigned char* pU, unsigned char* pV, unsigned char* pA,
                                   int nPitchY, int nPitchU, int nPitchV, tagBITMAPINFOHEADER* lpSrcBmi,
@@ -91,18 +89,18 @@ AVPOST_API void Yuv420_2_Argb(tagBITMAPINFOHEADER* lpDstBmi, unsigned char* lpDs
 // Packed 4:2:2 rectangle at (xSrc, ySrc) into planar 4:2:0 at (xDst, yDst); the chroma of a row
 // pair is the truncated average of its two rows, an odd last row keeps its own chroma.
 AVPOST_API void YUY2_2_Yuv420(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
-                              int nPitchV, int xDst, int yDst, int cx, int cy, unsigned char* lpBitsSrc,
-                              int nPitchSrc, unsigned int bYUY2, int xSrc, int ySrc);
+                              int nPitchV, int xDst, int yDst, int cx, int cy, unsigned char* lpBitsSrc, int nPitchSrc,
+                              unsigned int bYUY2, int xSrc, int ySrc);
 // Planar 4:2:0 rectangle at (xSrc, ySrc) into packed 4:2:2 at (xDst, yDst); each chroma row is
 // repeated for both rows of its pair.
 AVPOST_API void Yuv420_2_YUY2(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cx, int cy,
-                              unsigned int bYUY2, unsigned char* pY, unsigned char* pU, unsigned char* pV,
-                              int nPitchY, int nPitchU, int nPitchV, int xSrc, int ySrc);
+                              unsigned int bYUY2, unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY,
+                              int nPitchU, int nPitchV, int xSrc, int ySrc);
 // Packed 4:2:2 rectangle into a bottom-up 24-bit picture nHeightDst rows high (rows nPitchDst
 // bytes apart).
-AVPOST_API void YUY2_2_Rgb24(unsigned char* lpBitsDst, int nHeightDst, int nPitchDst, int xDst, int yDst,
-                             int cxDst, int cyDst, unsigned char* lpBitsSrc, int nPitchSrc, unsigned int bYUY2,
-                             int xSrc, int ySrc);
+AVPOST_API void YUY2_2_Rgb24(unsigned char* lpBitsDst, int nHeightDst, int nPitchDst, int xDst, int yDst, int cxDst,
+                             int cyDst, unsigned char* lpBitsSrc, int nPitchSrc, unsigned int bYUY2, int xSrc,
+                             int ySrc);
 // Bottom-up 24-bit picture nHeightSrc rows high into a packed 4:2:2 rectangle. When the rectangle
 // ends on an even column, its last pixel fills its whole group (its Y twice) if the group fits
 // within nPitchDst; otherwise it writes only its own two bytes.
@@ -113,9 +111,9 @@ AVPOST_API void Rgb24_2_YUY2(unsigned char* lpBitsDst, int nPitchDst, int xDst, 
 // from chroma row y / 2, each starting at chroma column (x + 1) / 2 and holding the chroma samples
 // up to the last one under the luma rectangle in both pictures. Buffers must not overlap.
 AVPOST_API void YV12_Blt_fast(unsigned char* pYDst, unsigned char* pUDst, unsigned char* pVDst, int nPitchYDst,
-                              int nPitchUDst, int nPitchVDst, int xDst, int yDst, int cx, int cy,
-                              unsigned char* pYSrc, unsigned char* pUSrc, unsigned char* pVSrc, int nPitchYSrc,
-                              int nPitchUSrc, int nPitchVSrc, int xSrc, int ySrc);
+                              int nPitchUDst, int nPitchVDst, int xDst, int yDst, int cx, int cy, unsigned char* pYSrc,
+                              unsigned char* pUSrc, unsigned char* pVSrc, int nPitchYSrc, int nPitchUSrc,
+                              int nPitchVSrc, int xSrc, int ySrc);
 // Copies a packed 4:2:2 rectangle, reordering between YUY2 and UYVY when the flags differ.
 AVPOST_API void YUY2_Blt_fast(unsigned char* lpBitsDst, int nPitchDst, int xDst, int yDst, int cx, int cy,
                               unsigned int bYUY2Dst, unsigned char* lpBitsSrc, int nPitchSrc, unsigned int bYUY2Src,

@@ -13,10 +13,7 @@ namespace avpost::detail {
 namespace {
 
 // Offset of the Y byte inside a pixel's two bytes: YUY2 is Y0 U Y1 V, UYVY is U Y0 V Y1.
-int LumaOffset(unsigned format)
-{
-    return format != 0 ? 0 : 1;
-}
+int LumaOffset(unsigned format) { return format != 0 ? 0 : 1; }
 
 // One packed 4:2:2 row addressed by picture column. Pixel p owns bytes 2p and 2p + 1: its Y and
 // one chroma sample of its group, U for an even p and V for an odd p. The colour of a pixel is the
@@ -50,10 +47,7 @@ private:
     int luma_;
 };
 
-unsigned char* RowStart(const PackedRect& rect, int k)
-{
-    return rect.bits + (rect.y + k) * rect.pitch;
-}
+unsigned char* RowStart(const PackedRect& rect, int k) { return rect.bits + (rect.y + k) * rect.pitch; }
 
 // Row k of a rectangle of a bottom-up picture, from the rectangle's first column.
 unsigned char* RowStart(const RgbRect& rect, int k)
@@ -107,8 +101,8 @@ int PackedPairToPlanar(const PackedPairRows& rows, int columns, int lumaOffset)
     return c;
 }
 
-void RowPairToPlanar(const PackedRow& top, const PackedRow& bottom, int x, int cx, unsigned char* y0,
-                     unsigned char* y1, unsigned char* u, unsigned char* v)
+void RowPairToPlanar(const PackedRow& top, const PackedRow& bottom, int x, int cx, unsigned char* y0, unsigned char* y1,
+                     unsigned char* u, unsigned char* v)
 {
     static constexpr simd::Variants<PackedToPlanarKernel> kKernels{
         {PackedPairToPlanar, nullptr, nullptr, nullptr, PackedToPlanarAvx2}};
@@ -132,10 +126,7 @@ int PlanarRowToPacked(const unsigned char* y, const unsigned char* u, const unsi
     return c;
 }
 
-ChromaTerms GroupTerms(const PackedRow& in, int p)
-{
-    return TableChromaTerms(in.U(p), in.V(p));
-}
+ChromaTerms GroupTerms(const PackedRow& in, int p) { return TableChromaTerms(in.U(p), in.V(p)); }
 
 // The kernels' reference: whole groups from a group boundary into 24-bit pixels.
 int PackedGroupsToRgb24(const unsigned char* packed, unsigned char* bgr, int columns, int lumaOffset)
@@ -169,10 +160,7 @@ void PutLonePixel(const PackedRow& out, int p, const LumaChroma& a)
 }
 
 // How many chroma columns, from (x + 1) / 2 on, cover luma columns of the span [x, x + cx).
-int ChromaColumnsUnder(int x, int cx)
-{
-    return (x + cx + 1) / 2 - (x + 1) / 2;
-}
+int ChromaColumnsUnder(int x, int cx) { return (x + cx + 1) / 2 - (x + 1) / 2; }
 
 int SwapPixelBytes(unsigned char* dst, const unsigned char* src, int cx)
 {

@@ -226,20 +226,11 @@ int TableBlocks(const RgbBlockRows& rows, int evenWidth)
 
 }  // namespace
 
-int Rgb24BlocksAvx2(const RgbBlockRows& rows, int evenWidth)
-{
-    return TableBlocks<3, false>(rows, evenWidth);
-}
+int Rgb24BlocksAvx2(const RgbBlockRows& rows, int evenWidth) { return TableBlocks<3, false>(rows, evenWidth); }
 
-int Rgb32BlocksAvx2(const RgbBlockRows& rows, int evenWidth)
-{
-    return TableBlocks<4, false>(rows, evenWidth);
-}
+int Rgb32BlocksAvx2(const RgbBlockRows& rows, int evenWidth) { return TableBlocks<4, false>(rows, evenWidth); }
 
-int Rgb32AlphaBlocksAvx2(const RgbBlockRows& rows, int evenWidth)
-{
-    return TableBlocks<4, true>(rows, evenWidth);
-}
+int Rgb32AlphaBlocksAvx2(const RgbBlockRows& rows, int evenWidth) { return TableBlocks<4, true>(rows, evenWidth); }
 
 // Per-pixel path: every value clamped, chroma the sum of four clamped values >> 2.
 int Rgb24SimpleBlocksAvx2(const RgbBlockRows& rows, int evenWidth)

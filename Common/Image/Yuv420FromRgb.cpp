@@ -51,8 +51,7 @@ RgbBlocksKernel PickRgbBlocks()
     using Kernels = simd::Variants<RgbBlocksKernel>;
     static constexpr Kernels k24{{RgbBlocks<3, false>, nullptr, nullptr, nullptr, Rgb24BlocksAvx2}};
     static constexpr Kernels k32{{RgbBlocks<4, false>, nullptr, nullptr, nullptr, Rgb32BlocksAvx2}};
-    static constexpr Kernels k32Alpha{
-        {RgbBlocks<4, true>, nullptr, nullptr, nullptr, Rgb32AlphaBlocksAvx2}};
+    static constexpr Kernels k32Alpha{{RgbBlocks<4, true>, nullptr, nullptr, nullptr, Rgb32AlphaBlocksAvx2}};
     if constexpr (kBytes == 3)
         return k24.Pick();
     else if constexpr (kAlpha)
@@ -89,8 +88,8 @@ public:
 
     void BlockRow(int r, int evenWidth) const
     {
-        const RgbBlockRows rows{src_.Row(r), src_.Row(r + 1), dst_.YRow(r),  dst_.YRow(r + 1),
-                                dst_.URow(r >> 1), dst_.VRow(r >> 1), AlphaRow(r), AlphaRow(r + 1)};
+        const RgbBlockRows rows{src_.Row(r),       src_.Row(r + 1),   dst_.YRow(r), dst_.YRow(r + 1),
+                                dst_.URow(r >> 1), dst_.VRow(r >> 1), AlphaRow(r),  AlphaRow(r + 1)};
         const int done = blocks_(rows, evenWidth);
         if (done < evenWidth)
             RgbBlocks<kBytes, kAlpha>(Advanced<kBytes>(rows, done), evenWidth - done);
@@ -125,10 +124,7 @@ private:
             return nullptr;
     }
 
-    LumaChroma Take(int r, int c) const
-    {
-        return StoreLuma<kBytes, kAlpha>(src_.Row(r), dst_.YRow(r), AlphaRow(r), c);
-    }
+    LumaChroma Take(int r, int c) const { return StoreLuma<kBytes, kAlpha>(src_.Row(r), dst_.YRow(r), AlphaRow(r), c); }
 
     // Stores the chroma sample covering pixel (c, r).
     void PutChroma(int r, int c, unsigned char u, unsigned char v) const

@@ -222,25 +222,13 @@ int Blocks(const YuvBlockRows& rows, int evenWidth, Output output)
 
 }  // namespace
 
-int YuvBlocksToRgb24Avx2(const YuvBlockRows& rows, int evenWidth)
-{
-    return Blocks(rows, evenWidth, kRgb24);
-}
+int YuvBlocksToRgb24Avx2(const YuvBlockRows& rows, int evenWidth) { return Blocks(rows, evenWidth, kRgb24); }
 
-int YuvBlocksToRgb32Avx2(const YuvBlockRows& rows, int evenWidth)
-{
-    return Blocks(rows, evenWidth, kRgb32Keep);
-}
+int YuvBlocksToRgb32Avx2(const YuvBlockRows& rows, int evenWidth) { return Blocks(rows, evenWidth, kRgb32Keep); }
 
-int YuvBlocksToOpaqueAvx2(const YuvBlockRows& rows, int evenWidth)
-{
-    return Blocks(rows, evenWidth, kRgb32Opaque);
-}
+int YuvBlocksToOpaqueAvx2(const YuvBlockRows& rows, int evenWidth) { return Blocks(rows, evenWidth, kRgb32Opaque); }
 
-int YuvSimpleBlocksAvx2(const YuvBlockRows& rows, int evenWidth)
-{
-    return Blocks(rows, evenWidth, kRgb24PerPixel);
-}
+int YuvSimpleBlocksAvx2(const YuvBlockRows& rows, int evenWidth) { return Blocks(rows, evenWidth, kRgb24PerPixel); }
 
 int PackedToRgb24Avx2(const unsigned char* packed, unsigned char* bgr, int columns, int lumaOffset)
 {

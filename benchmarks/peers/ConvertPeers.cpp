@@ -58,10 +58,7 @@ PackedView BottomUp(Bytes& bits, int stride)
     return {bits.data() + static_cast<size_t>(kHeight - 1) * stride, -stride};
 }
 
-PackedView TopDown(Bytes& bits, int stride)
-{
-    return {bits.data(), stride};
-}
+PackedView TopDown(Bytes& bits, int stride) { return {bits.data(), stride}; }
 
 struct SwsDeleter {
     void operator()(SwsContext* context) const { sws_freeContext(context); }
@@ -74,8 +71,7 @@ std::unique_ptr<SwsContext, SwsDeleter> Scaler(AVPixelFormat from, AVPixelFormat
         sws_getContext(kWidth, kHeight, from, kWidth, kHeight, to, SWS_POINT, nullptr, nullptr, nullptr));
 }
 
-void AddPackedToPlanar(const char* work, AVPixelFormat format, Bytes Pictures::*bits, int bytesPerPixel,
-                       bool bottomUp)
+void AddPackedToPlanar(const char* work, AVPixelFormat format, Bytes Pictures::*bits, int bytesPerPixel, bool bottomUp)
 {
     peers::AddWork(work, "libswscale", [=](benchmark::State& state) {
         Bytes y(kWidth * kHeight), u(kChromaWidth * kHeight / 2), v(u.size());
@@ -200,8 +196,8 @@ void RegisterYuvToRgb()
         Yuv420_2_rgb24(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_rgb24_bottom_up", "libyuv", 3, [&in](unsigned char* bits) {
-        libyuv::I420ToRGB24(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits,
-                            kWidth * 3, kWidth, -kHeight);
+        libyuv::I420ToRGB24(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits, kWidth * 3,
+                            kWidth, -kHeight);
     });
     AddPlanarToPacked("i420_to_rgb24_bottom_up", AV_PIX_FMT_BGR24, 3, true);
 
@@ -210,8 +206,8 @@ void RegisterYuvToRgb()
         Yuv420_2_rgb32(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_rgb32_bottom_up", "libyuv", 4, [&in](unsigned char* bits) {
-        libyuv::I420ToARGB(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits,
-                           kWidth * 4, kWidth, -kHeight);
+        libyuv::I420ToARGB(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits, kWidth * 4,
+                           kWidth, -kHeight);
     });
     AddPlanarToPacked("i420_to_rgb32_bottom_up", AV_PIX_FMT_BGRA, 4, true);
 
@@ -220,8 +216,8 @@ void RegisterYuvToRgb()
         Yuv420_2_Argb(&header, bits, in.y.data(), in.u.data(), in.v.data(), kWidth, kChromaWidth, kChromaWidth);
     });
     AddToPacked("i420_to_argb_top_down", "libyuv", 4, [&in](unsigned char* bits) {
-        libyuv::I420ToARGB(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits,
-                           kWidth * 4, kWidth, kHeight);
+        libyuv::I420ToARGB(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits, kWidth * 4,
+                           kWidth, kHeight);
     });
     AddPlanarToPacked("i420_to_argb_top_down", AV_PIX_FMT_BGRA, 4, false);
 }
@@ -230,8 +226,8 @@ void RegisterPackedYuv()
 {
     Pictures& in = Input();
     AddToPlanar("yuy2_to_i420", peers::kOurs, [&in](auto y, auto u, auto v, auto) {
-        YUY2_2_Yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, 0, 0, kWidth, kHeight, in.yuy2.data(), kWidth * 2,
-                      1, 0, 0);
+        YUY2_2_Yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, 0, 0, kWidth, kHeight, in.yuy2.data(), kWidth * 2, 1,
+                      0, 0);
     });
     AddToPlanar("yuy2_to_i420", "libyuv", [&in](auto y, auto u, auto v, auto) {
         libyuv::YUY2ToI420(in.yuy2.data(), kWidth * 2, y, kWidth, u, kChromaWidth, v, kChromaWidth, kWidth, kHeight);
@@ -239,8 +235,8 @@ void RegisterPackedYuv()
     AddPackedToPlanar("yuy2_to_i420", AV_PIX_FMT_YUYV422, &Pictures::yuy2, 2, false);
 
     AddToPlanar("uyvy_to_i420", peers::kOurs, [&in](auto y, auto u, auto v, auto) {
-        YUY2_2_Yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, 0, 0, kWidth, kHeight, in.yuy2.data(), kWidth * 2,
-                      0, 0, 0);
+        YUY2_2_Yuv420(y, u, v, kWidth, kChromaWidth, kChromaWidth, 0, 0, kWidth, kHeight, in.yuy2.data(), kWidth * 2, 0,
+                      0, 0);
     });
     AddToPlanar("uyvy_to_i420", "libyuv", [&in](auto y, auto u, auto v, auto) {
         libyuv::UYVYToI420(in.yuy2.data(), kWidth * 2, y, kWidth, u, kChromaWidth, v, kChromaWidth, kWidth, kHeight);
@@ -252,8 +248,8 @@ void RegisterPackedYuv()
                       kChromaWidth, kChromaWidth, 0, 0);
     });
     AddToPacked("i420_to_yuy2", "libyuv", 2, [&in](unsigned char* bits) {
-        libyuv::I420ToYUY2(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits,
-                           kWidth * 2, kWidth, kHeight);
+        libyuv::I420ToYUY2(in.y.data(), kWidth, in.u.data(), kChromaWidth, in.v.data(), kChromaWidth, bits, kWidth * 2,
+                           kWidth, kHeight);
     });
     AddPlanarToPacked("i420_to_yuy2", AV_PIX_FMT_YUYV422, 2, false);
 

@@ -32,8 +32,9 @@ unsigned char Scene(int x, int y, int channel, std::mt19937& grain)
 {
     const double radius = std::hypot(x - kWidth * 0.6, y - kHeight * 0.4);
     const double rings = 40.0 * std::sin(radius * radius / 9000.0 + channel);
-    const double ramp = channel == 0 ? 200.0 * y / kHeight : channel == 1 ? 120.0 * (x + y) / (kWidth + kHeight)
-                                                                          : 220.0 * x / kWidth;
+    const double ramp = channel == 0   ? 200.0 * y / kHeight
+                        : channel == 1 ? 120.0 * (x + y) / (kWidth + kHeight)
+                                       : 220.0 * x / kWidth;
     const double value = 20.0 + ramp + rings + static_cast<int>(grain() % 9) - 4;
     return static_cast<unsigned char>(value < 0 ? 0 : value > 255 ? 255 : value);
 }
@@ -100,8 +101,7 @@ unsigned long CompressToFile(tjhandle compressor, const unsigned char* bgr, int 
 {
     unsigned char* jpeg = nullptr;
     unsigned long size = 0;
-    if (tjCompress2(compressor, bgr, kWidth, pitch, kHeight, TJPF_BGR, &jpeg, &size, TJSAMP_444, kQuality, flags) !=
-        0)
+    if (tjCompress2(compressor, bgr, kWidth, pitch, kHeight, TJPF_BGR, &jpeg, &size, TJSAMP_444, kQuality, flags) != 0)
         return 0;
     if (const auto file = avpost::detail::OpenFile(path.c_str(), "wb"))
         std::fwrite(jpeg, 1, size, file.get());
@@ -151,8 +151,8 @@ void EncodeTurbo(benchmark::State& state)
     unsigned char* jpeg = nullptr;
     unsigned long size = 0;
     for (auto _ : state) {
-        tjCompress2(compressor.get(), file.data() + kBmpHeaderSize, kWidth, kWidth * 3, kHeight, TJPF_BGR, &jpeg,
-                    &size, TJSAMP_444, kQuality, TJFLAG_BOTTOMUP);
+        tjCompress2(compressor.get(), file.data() + kBmpHeaderSize, kWidth, kWidth * 3, kHeight, TJPF_BGR, &jpeg, &size,
+                    TJSAMP_444, kQuality, TJFLAG_BOTTOMUP);
         benchmark::DoNotOptimize(jpeg);
     }
     tjFree(jpeg);

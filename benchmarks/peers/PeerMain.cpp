@@ -39,7 +39,8 @@ public:
     void Finalize() override
     {
         ConsoleReporter::Finalize();
-        std::printf("\n| work | avpost ms | fastest peer | peer ms | ours/peer | all peers |\n|---|---|---|---|---|---|\n");
+        std::printf(
+            "\n| work | avpost ms | fastest peer | peer ms | ours/peer | all peers |\n|---|---|---|---|---|---|\n");
         for (const auto& [work, times] : medians_) {
             const auto ours = times.find(peers::kOurs);
             std::string best, others;

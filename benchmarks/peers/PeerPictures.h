@@ -24,7 +24,8 @@ inline Frame NoisePicture(int width, int height, unsigned seed = 1)
 {
     Frame picture(CreateYV12Frame(width, height, false, true));
     std::mt19937 random(seed);
-    const size_t bytes = static_cast<size_t>(width) * height + 2 * static_cast<size_t>((width + 1) / 2) * ((height + 1) / 2);
+    const size_t bytes =
+        static_cast<size_t>(width) * height + 2 * static_cast<size_t>((width + 1) / 2) * ((height + 1) / 2);
     for (size_t i = 0; i < bytes; ++i)
         picture->plane[0][i] = static_cast<unsigned char>(16 + random() % 220);
     return picture;
@@ -36,9 +37,8 @@ inline Frame BlackPicture(int width, int height) { return Frame(CreateYV12Frame(
 class SwsScaler {
 public:
     SwsScaler(int srcWidth, int srcHeight, int dstWidth, int dstHeight, int flags)
-        : srcHeight_(srcHeight),
-          context_(sws_getContext(srcWidth, srcHeight, AV_PIX_FMT_YUV420P, dstWidth, dstHeight, AV_PIX_FMT_YUV420P,
-                                  flags, nullptr, nullptr, nullptr))
+        : srcHeight_(srcHeight), context_(sws_getContext(srcWidth, srcHeight, AV_PIX_FMT_YUV420P, dstWidth, dstHeight,
+                                                         AV_PIX_FMT_YUV420P, flags, nullptr, nullptr, nullptr))
     {
     }
     ~SwsScaler() { sws_freeContext(context_); }

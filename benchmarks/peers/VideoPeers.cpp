@@ -129,8 +129,8 @@ void Libyuv(benchmark::State& state, const StageWork& work)
     for (auto _ : state) {
         ClearBars(*to, work.barWidth);
         libyuv::I420Scale(from->plane[0], from->pitch[0], from->plane[1], from->pitch[1], from->plane[2],
-                          from->pitch[2], work.srcWidth, work.srcHeight, inner.plane[0], inner.pitch[0],
-                          inner.plane[1], inner.pitch[1], inner.plane[2], inner.pitch[2], inner.width, inner.height,
+                          from->pitch[2], work.srcWidth, work.srcHeight, inner.plane[0], inner.pitch[0], inner.plane[1],
+                          inner.pitch[1], inner.plane[2], inner.pitch[2], inner.width, inner.height,
                           libyuv::kFilterBilinear);
         if (work.adjusted)
             tables.Apply(*to);

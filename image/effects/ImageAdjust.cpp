@@ -29,15 +29,9 @@ unsigned char Clamp(int64_t value, int lo, int hi)
 }
 
 // value + (value - 128) * percent / 100, the division truncating toward zero.
-int64_t StretchAboutMid(int value, int64_t percent)
-{
-    return value + (value - kMidLevel) * percent / 100;
-}
+int64_t StretchAboutMid(int value, int64_t percent) { return value + (value - kMidLevel) * percent / 100; }
 
-int64_t SaturationPercent(int saturation)
-{
-    return saturation > 0 ? 3 * int64_t{saturation} : saturation;
-}
+int64_t SaturationPercent(int saturation) { return saturation > 0 ? 3 * int64_t{saturation} : saturation; }
 
 // Every adjustment maps a sample's value alone, so the adjustments a plane gets are composed
 // into one map of its 256 values, applied in one pass.
@@ -51,10 +45,7 @@ ValueMap Unchanged(int low, int high)
     return map;
 }
 
-bool Changes(const ValueMap& map)
-{
-    return map.brightness != 0 || map.stretchCount > 0;
-}
+bool Changes(const ValueMap& map) { return map.brightness != 0 || map.stretchCount > 0; }
 
 void Brighten(ValueMap& map, int brightness)
 {
@@ -67,10 +58,7 @@ void Brighten(ValueMap& map, int brightness)
 // floor(a * n / 100) = (a * FractionOf(n)) >> 16 for n = 0...99 and every distance a = 0...128:
 // the factor exceeds n * 65536 / 100 by less than 1 / 65536 of a, which cannot carry a * n / 100,
 // at most 0.99 above an integer, past the next one.
-int FractionOf(int64_t hundredths)
-{
-    return static_cast<int>((hundredths * 65536 + 99) / 100);
-}
+int FractionOf(int64_t hundredths) { return static_cast<int>((hundredths * 65536 + 99) / 100); }
 
 // How far from 128 a stretch by `percent` moves a value at distance a. The value moves to
 // 128 + d + trunc(d * percent / 100) with d = v - 128, so the new distance is a * (100 + percent)
@@ -148,8 +136,8 @@ void MapChroma(unsigned char* pU, unsigned char* pV, int nPitchU, int nPitchV, i
 
 // The adjustments with their documented conditions: brightness needs the Y plane, contrast all
 // three, saturation U and V.
-void Adjust(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
-            int nWidth, int nHeight, int nBrightness, int nContrast, int nSaturation)
+void Adjust(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV, int nWidth,
+            int nHeight, int nBrightness, int nContrast, int nSaturation)
 {
     if (nWidth <= 0 || nHeight <= 0)
         return;
@@ -175,8 +163,8 @@ void Adjust(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY
 
 }  // namespace
 
-void AdjustBrightness(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
-                      int nPitchV, int nWidth, int nHeight, int nBrightness)
+void AdjustBrightness(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
+                      int nWidth, int nHeight, int nBrightness)
 {
     Adjust(pY, pU, pV, nPitchY, nPitchU, nPitchV, nWidth, nHeight, nBrightness, 0, 0);
 }
@@ -187,8 +175,8 @@ void AdjustContrast(unsigned char* pY, unsigned char* pU, unsigned char* pV, int
     Adjust(pY, pU, pV, nPitchY, nPitchU, nPitchV, nWidth, nHeight, 0, nContrast, 0);
 }
 
-void AdjustSaturation(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU,
-                      int nPitchV, int nWidth, int nHeight, int nSaturation)
+void AdjustSaturation(unsigned char* pY, unsigned char* pU, unsigned char* pV, int nPitchY, int nPitchU, int nPitchV,
+                      int nWidth, int nHeight, int nSaturation)
 {
     Adjust(pY, pU, pV, nPitchY, nPitchU, nPitchV, nWidth, nHeight, 0, 0, nSaturation);
 }
@@ -204,6 +192,6 @@ void AdjustImage(MEDIA_FRAME* frame, int nBrightness, int nContrast, int nSatura
     if (frame == nullptr)
         return;
     const int chromaPitch = ChromaLength(frame->width);
-    AdjustImage(frame->plane[0], frame->plane[1], frame->plane[2], frame->width, chromaPitch, chromaPitch,
-                frame->width, frame->height, nBrightness, nContrast, nSaturation);
+    AdjustImage(frame->plane[0], frame->plane[1], frame->plane[2], frame->width, chromaPitch, chromaPitch, frame->width,
+                frame->height, nBrightness, nContrast, nSaturation);
 }

@@ -135,12 +135,12 @@ int MapRowOfKinds(unsigned char* row, int count, StretchKind kind1, const MapCon
     if constexpr (kStretches < 2)
         return MapRow<kBrighten, kStretches, kKind0, kAddOnce>(row, count, k);
     switch (kind1) {
-        case kAddOnce:
-            return MapRow<kBrighten, kStretches, kKind0, kAddOnce>(row, count, k);
-        case kSubtractOnce:
-            return MapRow<kBrighten, kStretches, kKind0, kSubtractOnce>(row, count, k);
-        default:
-            return MapRow<kBrighten, kStretches, kKind0, kScaled>(row, count, k);
+    case kAddOnce:
+        return MapRow<kBrighten, kStretches, kKind0, kAddOnce>(row, count, k);
+    case kSubtractOnce:
+        return MapRow<kBrighten, kStretches, kKind0, kSubtractOnce>(row, count, k);
+    default:
+        return MapRow<kBrighten, kStretches, kKind0, kScaled>(row, count, k);
     }
 }
 
@@ -152,12 +152,12 @@ int MapRowOfShape(unsigned char* row, int count, const ValueMap& map, const MapC
     } else {
         const StretchKind kind1 = kStretches > 1 ? KindOf(map.stretch[1]) : kAddOnce;
         switch (KindOf(map.stretch[0])) {
-            case kAddOnce:
-                return MapRowOfKinds<kBrighten, kStretches, kAddOnce>(row, count, kind1, k);
-            case kSubtractOnce:
-                return MapRowOfKinds<kBrighten, kStretches, kSubtractOnce>(row, count, kind1, k);
-            default:
-                return MapRowOfKinds<kBrighten, kStretches, kScaled>(row, count, kind1, k);
+        case kAddOnce:
+            return MapRowOfKinds<kBrighten, kStretches, kAddOnce>(row, count, kind1, k);
+        case kSubtractOnce:
+            return MapRowOfKinds<kBrighten, kStretches, kSubtractOnce>(row, count, kind1, k);
+        default:
+            return MapRowOfKinds<kBrighten, kStretches, kScaled>(row, count, kind1, k);
         }
     }
 }

@@ -43,10 +43,7 @@ namespace {
     return _mm256_blendv_epi8(low, high, isAbove);
 }
 
-[[gnu::always_inline]] inline __m256i Negated(__m256i bytes)
-{
-    return _mm256_sub_epi8(_mm256_setzero_si256(), bytes);
-}
+[[gnu::always_inline]] inline __m256i Negated(__m256i bytes) { return _mm256_sub_epi8(_mm256_setzero_si256(), bytes); }
 
 }  // namespace
 

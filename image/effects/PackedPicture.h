@@ -10,10 +10,7 @@ namespace avpost::detail {
 
 // Samples along one chroma axis of a 4:2:0 picture: half the luma count, rounded up.
 // Written so that the largest int does not overflow.
-inline int ChromaLength(int lumaLength)
-{
-    return lumaLength > 0 ? lumaLength - lumaLength / 2 : 0;
-}
+inline int ChromaLength(int lumaLength) { return lumaLength > 0 ? lumaLength - lumaLength / 2 : 0; }
 
 inline unsigned char* RowOf(unsigned char* plane, int pitch, int row)
 {
@@ -44,11 +41,16 @@ struct PackedPicture {
 // The packed view of a frame, or nothing for a null frame, a missing plane or an empty picture.
 inline std::optional<PackedPicture> PackedView(const MEDIA_FRAME* frame)
 {
-    if (frame == nullptr || frame->plane[0] == nullptr || frame->plane[1] == nullptr ||
-        frame->plane[2] == nullptr || frame->width <= 0 || frame->height <= 0)
+    if (frame == nullptr || frame->plane[0] == nullptr || frame->plane[1] == nullptr || frame->plane[2] == nullptr ||
+        frame->width <= 0 || frame->height <= 0)
         return std::nullopt;
-    return PackedPicture{frame->plane[0], frame->plane[1], frame->plane[2], frame->width, frame->height,
-                         ChromaLength(frame->width), ChromaLength(frame->height)};
+    return PackedPicture{frame->plane[0],
+                         frame->plane[1],
+                         frame->plane[2],
+                         frame->width,
+                         frame->height,
+                         ChromaLength(frame->width),
+                         ChromaLength(frame->height)};
 }
 
 }  // namespace avpost::detail

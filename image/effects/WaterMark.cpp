@@ -33,15 +33,9 @@ std::optional<Watermark> WatermarkView(const MEDIA_FRAME* frame)
 }
 
 // Opacity of one pixel; the level is already limited to 0...100, so the result is 0...255.
-int Opacity(int level, unsigned char alpha)
-{
-    return level * alpha / 100;
-}
+int Opacity(int level, unsigned char alpha) { return level * alpha / 100; }
 
-int LimitLevel(int level)
-{
-    return std::clamp(level, 0, 100);
-}
+int LimitLevel(int level) { return std::clamp(level, 0, 100); }
 
 // One axis of the area AddWaterMarkEx draws: where it starts in the frame and in the watermark,
 // and how many pixels it covers (0 or less: nothing). Worked in 64 bits so no input overflows.
@@ -145,8 +139,7 @@ void BlendClipped(const PackedPicture& dst, const Watermark& mark, Run cols, Run
         const int srcCol = cols.markStart + chroma.first - cols.frameStart;
         const ptrdiff_t under = static_cast<ptrdiff_t>(dstRow / 2) * dst.chromaWidth + chroma.first / 2;
         const ptrdiff_t over = static_cast<ptrdiff_t>(srcRow / 2) * src.chromaWidth + srcCol / 2;
-        BlendChromaRun({dst.u + under, dst.v + under, src.u + over, src.v + over, alpha + srcCol}, chroma.count,
-                       level);
+        BlendChromaRun({dst.u + under, dst.v + under, src.u + over, src.v + over, alpha + srcCol}, chroma.count, level);
     }
 }
 
@@ -208,8 +201,8 @@ void BlendAligned(const PackedPicture& dst, const Watermark& mark, Position at, 
 int SaturatedDifference(int32_t a, int32_t b)
 {
     const int64_t difference = int64_t{a} - b;
-    return static_cast<int>(std::clamp<int64_t>(difference, std::numeric_limits<int32_t>::min(),
-                                                std::numeric_limits<int32_t>::max()));
+    return static_cast<int>(
+        std::clamp<int64_t>(difference, std::numeric_limits<int32_t>::min(), std::numeric_limits<int32_t>::max()));
 }
 
 }  // namespace

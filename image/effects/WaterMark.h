@@ -14,8 +14,8 @@
 // Draws the part of the watermark that starts at (wx, wy) at position (x, y), at most
 // width x height pixels (-1 = the frame's width or height), cut to both frames. Parts that
 // would fall left of or above the frame are skipped; negative wx or wy draw nothing.
-AVPOST_API void AddWaterMarkEx(MEDIA_FRAME* frame, const MEDIA_FRAME* watermark, int x, int y, int width,
-                               int height, int wx, int wy, int level);
+AVPOST_API void AddWaterMarkEx(MEDIA_FRAME* frame, const MEDIA_FRAME* watermark, int x, int y, int width, int height,
+                               int wx, int wy, int level);
 
 // With a rectangle: draws the watermark at its own size from the rectangle's top-left corner, cut
 // to the rectangle and the frame (see AddWaterMarkEx). Without one: places it by the alignment

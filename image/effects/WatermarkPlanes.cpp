@@ -65,14 +65,12 @@ MEDIA_FRAME* WatermarkPlanes::Scale(int width, int height) const
 
     MEDIA_FRAME* frame = CreateYV12Frame(width, height, true, true);
     const int dstChromaPitch = (width + 1) / 2;
-    ResizeY(frame->plane[0], width, height, width, y, width_, height_, width_,
-            INTERPOLATION_BILINEAR);
-    ResizeUV(frame->plane[1], width, height, dstChromaPitch, u, width_, height_,
-             srcChromaPitch, INTERPOLATION_BILINEAR);
-    ResizeUV(frame->plane[2], width, height, dstChromaPitch, v, width_, height_,
-             srcChromaPitch, INTERPOLATION_BILINEAR);
-    ResizeY(frame->plane[3], width, height, width, a, width_, height_, width_,
-            INTERPOLATION_BILINEAR);
+    ResizeY(frame->plane[0], width, height, width, y, width_, height_, width_, INTERPOLATION_BILINEAR);
+    ResizeUV(frame->plane[1], width, height, dstChromaPitch, u, width_, height_, srcChromaPitch,
+             INTERPOLATION_BILINEAR);
+    ResizeUV(frame->plane[2], width, height, dstChromaPitch, v, width_, height_, srcChromaPitch,
+             INTERPOLATION_BILINEAR);
+    ResizeY(frame->plane[3], width, height, width, a, width_, height_, width_, INTERPOLATION_BILINEAR);
     return frame;
 }
 

@@ -11,7 +11,7 @@ struct BlockPaddedPicture {
     std::unique_ptr<unsigned char[]> pixels;  // blue, green, red; paddedWidth x paddedHeight
     uint32_t width = 0;                       // the picture's own size
     uint32_t height = 0;
-    uint32_t paddedWidth = 0;                 // rounded up to multiples of 8
+    uint32_t paddedWidth = 0;  // rounded up to multiples of 8
     uint32_t paddedHeight = 0;
 
     size_t Bytes() const { return size_t{paddedWidth} * paddedHeight * 3; }

@@ -32,9 +32,9 @@ public:
     // is null or the file cannot be created. Short writes are not detected.
     int Save(const char* path);
 
-    int32_t stride = 0;              // bytes per pixel row
-    unsigned char* bits = nullptr;   // stride x height bytes of rows, then 4 spare bytes
-    tagBITMAPINFO* info = nullptr;   // header followed by the colour table
+    int32_t stride = 0;             // bytes per pixel row
+    unsigned char* bits = nullptr;  // stride x height bytes of rows, then 4 spare bytes
+    tagBITMAPINFO* info = nullptr;  // header followed by the colour table
 };
 
 #endif

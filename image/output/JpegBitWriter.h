@@ -12,7 +12,7 @@ namespace avpost::jpeg {
 // so that the scan holds no marker. A value: coding loops keep it in a local, where its state can
 // stay in registers, and write to room that JpegBitWriter::Begin made.
 struct BitCursor {
-    uint64_t pending;    // the low 64 - free bits are still to be written
+    uint64_t pending;  // the low 64 - free bits are still to be written
     int free;
     unsigned char* out;  // the next byte
 

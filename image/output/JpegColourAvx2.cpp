@@ -60,9 +60,9 @@ Constants MakeConstants()
 // Eight pixels from 24 bytes, read as bytes 0-15 and 8-23.
 void ConvertEight(const unsigned char* pixels, const Constants& k, signed char* y, signed char* cb, signed char* cr)
 {
-    const __m256i bytes = _mm256_inserti128_si256(
-        _mm256_castsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(pixels))),
-        _mm_loadu_si128(reinterpret_cast<const __m128i*>(pixels + 8)), 1);
+    const __m256i bytes =
+        _mm256_inserti128_si256(_mm256_castsi128_si256(_mm_loadu_si128(reinterpret_cast<const __m128i*>(pixels))),
+                                _mm_loadu_si128(reinterpret_cast<const __m128i*>(pixels + 8)), 1);
     const __m256i redGreen = _mm256_shuffle_epi8(bytes, k.redGreen);
     const __m256i blueGreen = _mm256_shuffle_epi8(bytes, k.blueGreen);
     const __m256i redBlue = _mm256_shuffle_epi8(bytes, k.redBlue);

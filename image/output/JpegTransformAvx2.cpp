@@ -84,7 +84,7 @@ constexpr ZigzagGather MakeZigzagGather()
     for (int natural = 0; natural < 64; ++natural) {
         const int position = zigzag[natural];
         const int lane = position / 16 % 2;
-        const int chunk = natural / 16;  // 16 natural indexes
+        const int chunk = natural / 16;                           // 16 natural indexes
         const int held[4][2] = {{0, 1}, {1, 0}, {2, 3}, {3, 2}};  // chunk in lane 0 and lane 1 of each source
         for (int v = 0; v < 4; ++v)
             if (held[v][lane] == chunk)
@@ -126,7 +126,7 @@ void TransformBlocksAvx2(const signed char* samples, int blockCount, const float
         AanDctPass(lines, 1);  // over the rows: lane i is row i
         Transpose(lines);
         AanDctPass(lines, 1);  // over the columns: lane j is column j
-        __m256i rows[4];  // two rows each
+        __m256i rows[4];       // two rows each
         for (int r = 0; r < 4; ++r) {
             const __m256i packed = _mm256_packs_epi32(QuantizeRow(lines[2 * r], divisors + 16 * r),
                                                       QuantizeRow(lines[2 * r + 1], divisors + 16 * r + 8));

@@ -99,7 +99,7 @@ void TransformBlocksSsse3(const signed char* samples, int blockCount, const floa
         // left/right: columns 0-3 and 4-7 after the transposition, lane j being column j.
         __m128 top[8], bottom[8], left[8], right[8];
         LoadColumns(samples, top, bottom);
-        AanDctPass(top, 1);  // over rows 0-3
+        AanDctPass(top, 1);     // over rows 0-3
         AanDctPass(bottom, 1);  // over rows 4-7
         for (int i = 0; i < 8; ++i) {
             left[i] = i < 4 ? top[i] : bottom[i - 4];
@@ -113,8 +113,8 @@ void TransformBlocksSsse3(const signed char* samples, int blockCount, const floa
         AanDctPass(right, 1);
         __m128i rows[8];
         for (int r = 0; r < 8; ++r) {
-            rows[r] = _mm_packs_epi32(QuantizeFour(left[r], divisors + 8 * r),
-                                      QuantizeFour(right[r], divisors + 8 * r + 4));
+            rows[r] =
+                _mm_packs_epi32(QuantizeFour(left[r], divisors + 8 * r), QuantizeFour(right[r], divisors + 8 * r + 4));
             _mm_storeu_si128(reinterpret_cast<__m128i*>(coefficients + 8 * r), rows[r]);
         }
         nonzero[block] = NonzeroMask(rows);

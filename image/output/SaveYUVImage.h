@@ -10,7 +10,7 @@
 // removed afterwards). Returns 1 when the bitmap was written, 0 otherwise. In JPEG mode a
 // name whose UTF-8 form leaves no room for the temporary name in 511 bytes is refused (0,
 // nothing written); a BMP name longer than 511 bytes is cut after the last whole character.
-AVPOST_API int SaveYUVImage(const wchar_t* path, int jpeg, int width, int height, unsigned char* y,
-                            unsigned char* u, unsigned char* v, int pitchY, int pitchU, int pitchV);
+AVPOST_API int SaveYUVImage(const wchar_t* path, int jpeg, int width, int height, unsigned char* y, unsigned char* u,
+                            unsigned char* v, int pitchY, int pitchU, int pitchV);
 
 #endif

@@ -33,7 +33,6 @@ int DIB_ResizeBiLinerY_Simulate(const IMG_PARAM& src, IMG_PARAM& dst)
         AverageRowPair(TopDownRow(src, src.y + WholePart(fy)), TopDownRow(src, src.y + WholePart(fy + steps.y)), src,
                        steps.x, TopDownRow(dst, dst.y + j) + dst.x, dst.cx);
     }
-    CopyNearestRow(TopDownRow(src, LastRow(src)), src.x, steps.x, TopDownRow(dst, dst.y + dst.cy - 1) + dst.x,
-                   dst.cx);
+    CopyNearestRow(TopDownRow(src, LastRow(src)), src.x, steps.x, TopDownRow(dst, dst.y + dst.cy - 1) + dst.x, dst.cx);
     return 1;
 }

@@ -102,10 +102,10 @@ GatherPlan GatherTable::Plan(const ResizeRowSet& set)
     if (plannedFor_ != &set || index != plannedIndex_) {
         plannedIndex_ = index;
         plannedFor_ = &set;
-        windowed_ = set.gather != nullptr &&
-                    FitWindows(
-                        count, [this](int32_t o, int32_t& low, int32_t& high) { Widen(index[o], low, high); },
-                        windows_);
+        windowed_ =
+            set.gather != nullptr &&
+            FitWindows(
+                count, [this](int32_t o, int32_t& low, int32_t& high) { Widen(index[o], low, high); }, windows_);
         if (windowed_) {
             const int32_t blocks = BlockCount(count);
             picks_.assign(static_cast<size_t>(blocks + 1) * kPlanWindow, kZeroByte);
@@ -184,8 +184,16 @@ BlendPlan BlendTable::Plan(const ResizeRowSet& set)
         windowed_ = set.blendColumns != nullptr && MakeWindows();
         paired_ = !windowed_ && set.blendPairs != nullptr && MakePairs();
     }
-    BlendPlan plan{static_cast<int32_t>(a.size()), a.data(), b.data(), w.data(), nullptr, nullptr, nullptr, nullptr,
-                   nullptr, nullptr};
+    BlendPlan plan{static_cast<int32_t>(a.size()),
+                   a.data(),
+                   b.data(),
+                   w.data(),
+                   nullptr,
+                   nullptr,
+                   nullptr,
+                   nullptr,
+                   nullptr,
+                   nullptr};
     if (windowed_) {
         plan.picksA = picksA_.data();
         plan.picksB = picksB_.data();

@@ -34,8 +34,7 @@ std::vector<int32_t> NearestIndexTable(int32_t first, int32_t srcSpan, int32_t d
 
 bool CanTabulate(const IMG_PARAM& src, const IMG_PARAM& dst)
 {
-    return src.lpBits != nullptr && dst.lpBits != nullptr && src.cx >= 1 && src.cy >= 1 && dst.cx >= 1 &&
-           dst.cy >= 1;
+    return src.lpBits != nullptr && dst.lpBits != nullptr && src.cx >= 1 && src.cy >= 1 && dst.cx >= 1 && dst.cy >= 1;
 }
 
 void Near(const IMG_PARAM& src, const IMG_PARAM& dst)
@@ -57,9 +56,9 @@ void BiLiner(const IMG_PARAM& src, const IMG_PARAM& dst)
             const int32_t left = tap.left * kRgbaBytes;
             const int32_t right = tap.right * kRgbaBytes;
             for (int k = 0; k < kColourBytes; ++k) {
-                pixel[k] = static_cast<unsigned char>(
-                    Bilerp(tap.upper[left + k], tap.upper[right + k], tap.lower[left + k], tap.lower[right + k], tap.wx,
-                           tap.wy));
+                pixel[k] =
+                    static_cast<unsigned char>(Bilerp(tap.upper[left + k], tap.upper[right + k], tap.lower[left + k],
+                                                      tap.lower[right + k], tap.wx, tap.wy));
             }
             pixel[kColourBytes] = tap.upper[left + kColourBytes];
         },

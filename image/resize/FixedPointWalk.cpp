@@ -6,8 +6,7 @@ namespace avpost::detail {
 
 bool IsWalkableSource(const IMG_PARAM& src)
 {
-    return src.lpBits != nullptr && src.cx >= 1 && src.cy >= 1 && src.cx <= kMaxSourceSpan &&
-           src.cy <= kMaxSourceSpan;
+    return src.lpBits != nullptr && src.cx >= 1 && src.cy >= 1 && src.cx <= kMaxSourceSpan && src.cy <= kMaxSourceSpan;
 }
 
 bool CanStep(const IMG_PARAM& src, const IMG_PARAM& dst)

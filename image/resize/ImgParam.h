@@ -31,7 +31,7 @@ static_assert(sizeof(IMG_PARAM) == 36, "IMG_PARAM is nine 32-bit words on 32-bit
 static_assert(offsetof(IMG_PARAM, nWidth) == sizeof(void*), "IMG_PARAM starts with its buffer");
 
 enum IMAGE_INTERPOLATION : int32_t {
-    INTERPOLATION_DEFAULT = 0,   // bilinear
+    INTERPOLATION_DEFAULT = 0,  // bilinear
     INTERPOLATION_NEAREST = 1,
     INTERPOLATION_BILINEAR = 2,  // what the library itself asks for everywhere
     INTERPOLATION_BICUBIC = 3,   // 32-bit pixels only

@@ -8,8 +8,8 @@ using namespace avpost::detail;
 
 namespace {
 
-void BlendRows(const unsigned char* upper, const unsigned char* lower, int32_t wy, const IMG_PARAM& src,
-               int32_t stepX, unsigned char* out, int32_t count)
+void BlendRows(const unsigned char* upper, const unsigned char* lower, int32_t wy, const IMG_PARAM& src, int32_t stepX,
+               unsigned char* out, int32_t count)
 {
     const int32_t lastColumn = LastColumn(src);
     int64_t fx = 0;

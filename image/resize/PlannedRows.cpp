@@ -36,10 +36,7 @@ ResizeWorkspace& ThreadWorkspace()
     return workspace;
 }
 
-RowAddress TopDownRows(const IMG_PARAM& image, int32_t firstByte)
-{
-    return {image.lpBits + firstByte, image.nPitch};
-}
+RowAddress TopDownRows(const IMG_PARAM& image, int32_t firstByte) { return {image.lpBits + firstByte, image.nPitch}; }
 
 RowAddress BottomUpRows(const IMG_PARAM& image, int32_t firstByte)
 {

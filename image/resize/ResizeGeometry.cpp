@@ -1,6 +1,5 @@
 #include "image/resize/ResizeGeometry.h"
 
-
 #include "media/Truncate.h"
 
 using avpost::detail::TruncSaturate;
@@ -44,9 +43,8 @@ int32_t FillHeight(int aspectX, int aspectY, int srcWidth, int srcHeight, int ds
 {
     if (aspectX == 0 || aspectY == 0 || srcWidth == 0 || dstWidth == 0)
         return dstHeight;
-    return TruncSaturate<int32_t>(static_cast<double>(dstHeight) * dstWidth / dstWidth * aspectX / aspectY * srcHeight /
-                               srcWidth +
-                           0.5);
+    return TruncSaturate<int32_t>(
+        static_cast<double>(dstHeight) * dstWidth / dstWidth * aspectX / aspectY * srcHeight / srcWidth + 0.5);
 }
 
 // The display size of a w x h part of the source, or its pixel size without an aspect.
@@ -104,8 +102,8 @@ void CalcResizeParam(IMG_PARAM& src, IMG_PARAM& dst, int aspectX, int aspectY, i
         const int32_t fillHeight = FillHeight(aspectX, aspectY, srcWidth, srcHeight, dstWidth, dstHeight);
         ResizeRect(srcRect, {dstWidth, fillHeight}, RESIZE_KEEP_ASPECT);
     } else {
-        const tagSIZE size = DisplaySize(Span(srcRect.left, srcRect.right), Span(srcRect.top, srcRect.bottom),
-                                         aspectX, aspectY, srcWidth, srcHeight);
+        const tagSIZE size = DisplaySize(Span(srcRect.left, srcRect.right), Span(srcRect.top, srcRect.bottom), aspectX,
+                                         aspectY, srcWidth, srcHeight);
         ResizeRect(dstRect, size, method);
     }
     DescribePlane(src, srcWidth, srcHeight, srcRect);

@@ -32,8 +32,7 @@ AVPOST_API void ResizeRect(tagRECT& rect, tagSIZE size, IMAGE_RESIZE_METHOD meth
 // the aspect would be divided by) means the pixel size is the aspect. RESIZE_CROP_FILL narrows
 // the source rectangle and keeps the whole output; every other method narrows the output
 // rectangle. A null crop leaves both descriptors untouched.
-AVPOST_API void CalcResizeParam(IMG_PARAM& src, IMG_PARAM& dst, int aspectX, int aspectY, int srcWidth,
-                                int srcHeight, const tagRECT* crop, int dstWidth, int dstHeight,
-                                IMAGE_RESIZE_METHOD method);
+AVPOST_API void CalcResizeParam(IMG_PARAM& src, IMG_PARAM& dst, int aspectX, int aspectY, int srcWidth, int srcHeight,
+                                const tagRECT* crop, int dstWidth, int dstHeight, IMAGE_RESIZE_METHOD method);
 
 #endif

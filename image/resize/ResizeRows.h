@@ -24,7 +24,7 @@ constexpr int kPlanWindow = 16;
 struct GatherPlan {
     int32_t count;
     const int32_t* index;
-    const uint8_t* picks;    // null when some block's bytes do not fit one window
+    const uint8_t* picks;  // null when some block's bytes do not fit one window
     const int32_t* windows;
 };
 
@@ -44,19 +44,19 @@ struct BlendPlan {
     const int32_t* a;
     const int32_t* b;
     const int16_t* w;
-    const uint8_t* picksA;   // null when some block's bytes do not fit one window
+    const uint8_t* picksA;  // null when some block's bytes do not fit one window
     const uint8_t* picksB;
     const int16_t* eightfold;
     const int32_t* windows;
-    const int32_t* pairs;    // null when some output's bytes are not neighbours
+    const int32_t* pairs;  // null when some output's bytes are not neighbours
     const int16_t* pairWeights;
 };
 
 // A vertical blend of two rows: out[o] = upper[o] + (((lower[o] - upper[o]) x w) >> 12) with
 // w = eightfold[o % 8] / 8, so that a 32-bit pixel can keep its fourth byte (weight 0). upper
 // and lower may be read up to 32 bytes past count.
-using BlendRowsFunction = void (*)(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold,
-                                   uint8_t* out, int32_t count);
+using BlendRowsFunction = void (*)(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out,
+                                   int32_t count);
 using GatherFunction = void (*)(const uint8_t* row, const GatherPlan& plan, uint8_t* out);
 using BlendColumnsFunction = void (*)(const uint8_t* row, const BlendPlan& plan, uint8_t* out);
 
@@ -74,8 +74,7 @@ extern const ResizeRowSet kResizeRowsSsse3;
 extern const ResizeRowSet kResizeRowsAvx2;
 
 void BlendPairsSse2(const uint8_t* row, const BlendPlan& plan, uint8_t* out);
-void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out,
-                   int32_t count);
+void BlendRowsSse2(const uint8_t* upper, const uint8_t* lower, const int16_t* eightfold, uint8_t* out, int32_t count);
 
 }  // namespace avpost::detail
 

@@ -41,8 +41,8 @@ __m256i BlendPair(const uint8_t* row, const BlendPlan& plan, int32_t k)
     const __m256i a = _mm256_shuffle_epi8(windows, LoadWide(plan.picksA + k * kPlanWindow));
     const __m256i b = _mm256_shuffle_epi8(windows, LoadWide(plan.picksB + k * kPlanWindow));
     const __m256i difference = _mm256_sub_epi16(b, a);
-    return _mm256_add_epi16(a, _mm256_mulhi_epi16(_mm256_add_epi16(difference, difference),
-                                                  LoadWide(plan.eightfold + k * kPlanBlock)));
+    return _mm256_add_epi16(
+        a, _mm256_mulhi_epi16(_mm256_add_epi16(difference, difference), LoadWide(plan.eightfold + k * kPlanBlock)));
 }
 
 // upper + (((lower - upper) x w) >> 12) on 32 bytes, as in the SSE2 version.

@@ -15,7 +15,8 @@ __m128i BlendSixteen(__m128i upper, __m128i lower, __m128i eightfold)
     const __m128i upperLow = _mm_unpacklo_epi8(upper, zero), upperHigh = _mm_unpackhi_epi8(upper, zero);
     const __m128i lowLow = _mm_unpacklo_epi8(lower, zero), lowHigh = _mm_unpackhi_epi8(lower, zero);
     const __m128i differenceLow = _mm_sub_epi16(lowLow, upperLow), differenceHigh = _mm_sub_epi16(lowHigh, upperHigh);
-    const __m128i low = _mm_add_epi16(upperLow, _mm_mulhi_epi16(_mm_add_epi16(differenceLow, differenceLow), eightfold));
+    const __m128i low =
+        _mm_add_epi16(upperLow, _mm_mulhi_epi16(_mm_add_epi16(differenceLow, differenceLow), eightfold));
     const __m128i high =
         _mm_add_epi16(upperHigh, _mm_mulhi_epi16(_mm_add_epi16(differenceHigh, differenceHigh), eightfold));
     return _mm_packus_epi16(low, high);

@@ -30,8 +30,8 @@ __m128i BlendBlock(const uint8_t* row, const BlendPlan& plan, int32_t k)
     const __m128i a = _mm_shuffle_epi8(window, Load(plan.picksA + k * kPlanWindow));
     const __m128i b = _mm_shuffle_epi8(window, Load(plan.picksB + k * kPlanWindow));
     const __m128i difference = _mm_sub_epi16(b, a);
-    return _mm_add_epi16(a, _mm_mulhi_epi16(_mm_add_epi16(difference, difference),
-                                            Load(plan.eightfold + k * kPlanBlock)));
+    return _mm_add_epi16(a,
+                         _mm_mulhi_epi16(_mm_add_epi16(difference, difference), Load(plan.eightfold + k * kPlanBlock)));
 }
 
 // Output bytes 16 at a time from two blocks; a plan keeps a spare block after its last, so the

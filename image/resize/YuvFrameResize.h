@@ -24,14 +24,13 @@ AVPOST_API int ResizeUV(unsigned char* pDst, int dstWidth, int dstHeight, int ds
 // 2 x 2, and 1 otherwise, also when a kernel refused (an interpolation the planes do not offer).
 AVPOST_API int ImageResizeYV12(const IMG_PARAM& src, const unsigned char* pSrcY, const unsigned char* pSrcU,
                                const unsigned char* pSrcV, int srcPitchY, int srcPitchU, int srcPitchV,
-                               const IMG_PARAM& dst, unsigned char* pDstY, unsigned char* pDstU,
-                               unsigned char* pDstV, int dstPitchY, int dstPitchU, int dstPitchV,
-                               IMAGE_INTERPOLATION interpolation);
+                               const IMG_PARAM& dst, unsigned char* pDstY, unsigned char* pDstU, unsigned char* pDstV,
+                               int dstPitchY, int dstPitchU, int dstPitchV, IMAGE_INTERPOLATION interpolation);
 
 // ImageResizeYV12 with the planes and pitches of two frames. Returns 0 when a frame is null,
 // otherwise what ImageResizeYV12 returns.
-AVPOST_API int ImageResizeYUV(const IMG_PARAM& src, const MEDIA_FRAME* srcFrame, IMG_PARAM& dst,
-                              MEDIA_FRAME* dstFrame, IMAGE_INTERPOLATION interpolation);
+AVPOST_API int ImageResizeYUV(const IMG_PARAM& src, const MEDIA_FRAME* srcFrame, IMG_PARAM& dst, MEDIA_FRAME* dstFrame,
+                              IMAGE_INTERPOLATION interpolation);
 
 // Resizes a whole frame into another of its own size, always bilinear whatever interpolation
 // says: Y, U, V and the alpha plane. Both frames are taken as packed (luma pitch = width, chroma

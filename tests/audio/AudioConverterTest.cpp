@@ -26,9 +26,13 @@ protected:
 TEST_F(Converter, MixesByTheFixedTableAndInterpolatesAcrossBlocks)
 {
     // One expected output per block, in order.
-    const struct { int in, out, inRate, outRate; std::vector<Samples> blocks, expected; } cases[] = {
+    const struct {
+        int in, out, inRate, outRate;
+        std::vector<Samples> blocks, expected;
+    } cases[] = {
         {1, 2, 8000, 8000, {{1234}}, {{1234, 1234}}},
-        {2, 1, 8000, 8000, {{-3, -3, 32767, 32767, -32768, -32768, 9}}, {{-2, 32766, -32768}}},  // partial frame dropped
+        {2, 1, 8000, 8000, {{-3, -3, 32767, 32767, -32768, -32768, 9}}, {{-2, 32766, -32768}}},  // partial frame
+                                                                                                 // dropped
         {2, 6, 8000, 8000, {{7, -8}}, {{7, -8, 0, 0, 0, 0}}},
         {6, 1, 8000, 8000, {{20000, 20000, 20000, 20000, 20000, 20000, 1, 2, 3, 4, 5, 1000}}, {{32767, 15}}},
         {6, 2, 8000, 8000, {{-20000, -20000, -20000, -20000, -20000, 0, 1, 2, 3, 4, 5, 6}}, {{-32767, -32767, 9, 11}}},
@@ -36,15 +40,19 @@ TEST_F(Converter, MixesByTheFixedTableAndInterpolatesAcrossBlocks)
         {8, 1, 8000, 8000, {{7, 8, 15, 16, -9, 0, 0, 0}}, {{3}}},
         {3, 2, 8000, 8000, {{1, 2, 3, 4, 5, 6, 7}}, {Samples(7, 0)}},  // no rule: silence as long as the input
         // Mono: the first position lies between the history and the block.
-        {1, 1, 24000, 48000, {{0, 100, 200, 300}, {400, 500, 600, 700}},
+        {1,
+         1,
+         24000,
+         48000,
+         {{0, 100, 200, 300}, {400, 500, 600, 700}},
          {{0, 0, 50, 100, 150, 200, 250, 300}, {350, 400, 450, 500, 550, 600, 650, 700}}},
         {1, 1, 24000, 48000, {{0, -3}}, {{0, 0, -1, -3}}},  // steps truncate toward zero
         {1, 1, 48000, 24000, {Samples(8, -32768)}, {Samples(4, -32767)}},
         // Stereo at positions -1/3, 1/3 and 1 (in pairs); the last pair is the block's last.
         {2, 2, 32000, 48000, {{0, 1000, 300, -600}}, {{0, 666, 99, 467, 300, -600}}},
         // Six channels: each channel between whole frames, none borrowing from its neighbour.
-        {2, 6, 24000, 48000, {{100, 200, 300, 400}},
-         {{50, 100, 0, 0, 0, 0, 100, 200, 0, 0, 0, 0, 200, 300, 0, 0, 0, 0, 300, 400, 0, 0, 0, 0}}},
+        {2, 6, 24000, 48000, {{100, 200, 300, 400}}, {{50,  100, 0, 0, 0, 0, 100, 200, 0, 0, 0, 0,
+                                                       200, 300, 0, 0, 0, 0, 300, 400, 0, 0, 0, 0}}},
     };
     for (const auto& c : cases) {
         CAudioConverter converter(c.in, c.out, c.inRate, c.outRate, 0);
@@ -117,8 +125,9 @@ TEST_F(Converter, ChangeInputEmptiesTheFifoAndSaysSo)
     EXPECT_NE(converter.GetValidSize(), 0);
     converter.ChangeInput(1, 22050);
     EXPECT_EQ(converter.GetValidSize(), 0);
-    EXPECT_EQ(testing::internal::GetCapturedStdout(), " *** CAudioConverter::ChangeInput 2 => 1 channels.\r\n"
-                                                      " *** CAudioConverter::ChangeInput 44100 => 22050 Hz.\r\n");
+    EXPECT_EQ(testing::internal::GetCapturedStdout(),
+              " *** CAudioConverter::ChangeInput 2 => 1 channels.\r\n"
+              " *** CAudioConverter::ChangeInput 44100 => 22050 Hz.\r\n");
     ASSERT_EQ(log->size(), 2u);
     EXPECT_EQ(log->back(), L" *** CAudioConverter::ChangeInput 44100 => 22050 Hz.");
 }

@@ -67,15 +67,16 @@ TEST_F(EvenStage, GapIsFilledInPiecesWithTheLastSampleFrameOnAContiguousTimeLine
     EXPECT_EQ(block.startTime, 11000000);
     EXPECT_EQ(block.duration, 22676);
     EXPECT_EQ(stage.GetNextFrame(), nullptr);
-    EXPECT_EQ(*log, std::vector<std::wstring>{L"AudioEvenProcess:: Fill Blank Audio Data [0.01 sec/2048 bytes] before 1.10 sec."});
+    EXPECT_EQ(*log, std::vector<std::wstring>{
+                        L"AudioEvenProcess:: Fill Blank Audio Data [0.01 sec/2048 bytes] before 1.10 sec."});
 }
 
 TEST_F(EvenStage, OverlapsAreTrimmedWithoutTolerance)
 {
-    source.Add(0, Counting(4000, 50));                     // 1000 frames
-    source.Add(source.TimeOf(1001), Counting(400, 100));   // one frame late
-    source.Add(source.TimeOf(1100), Counting(400, 200));   // one frame early
-    source.Add(source.TimeOf(1200 - 441), Counting(4096)); // 10 ms early
+    source.Add(0, Counting(4000, 50));                      // 1000 frames
+    source.Add(source.TimeOf(1001), Counting(400, 100));    // one frame late
+    source.Add(source.TimeOf(1100), Counting(400, 200));    // one frame early
+    source.Add(source.TimeOf(1200 - 441), Counting(4096));  // 10 ms early
     AudioEvenProcess stage(&source);
     Pull(stage);
     const MEDIA_FRAME& filler = Pull(stage);
@@ -102,7 +103,7 @@ TEST_F(EvenStage, BlocksWhollyInThePastAreDroppedWithWhatTheyStillOwe)
     source.Add(source.TimeOf(950), Counting(1000, 77));
     source.Add(source.TimeOf(1100), Counting(400));  // exactly covered: the next block is taken whole
     source.Add(0, Counting(40, 5));
-    source.Add(0, Counting(2000));                  // owes more than the source has left
+    source.Add(0, Counting(2000));  // owes more than the source has left
     AudioEvenProcess stage(&source);
     Pull(stage);
     const MEDIA_FRAME& rest = Pull(stage);

@@ -19,9 +19,13 @@ Samples SamplesOf(const MEDIA_FRAME* frame)
 
 TEST(AudioVolume, ScalesTowardZeroAndClampsInPlace)
 {
-    const struct { short sample; int volume; short expected; } cases[] = {
-        {32767, 50, 16383}, {-3, 50, -1}, {-32768, 100, -32768}, {-32768, 99, -32440},
-        {20000, 200, 32767}, {-20000, 200, -32767}, {1000, -50, -500}, {-32768, 1000000, -32767},
+    const struct {
+        short sample;
+        int volume;
+        short expected;
+    } cases[] = {
+        {32767, 50, 16383},  {-3, 50, -1},          {-32768, 100, -32768}, {-32768, 99, -32440},
+        {20000, 200, 32767}, {-20000, 200, -32767}, {1000, -50, -500},     {-32768, 1000000, -32767},
     };
     for (const auto& c : cases) {
         short samples[3] = {c.sample, c.sample, 0x5A5};

@@ -41,7 +41,8 @@ public:
         lastSeekRequest = seconds;
         lastSeekFlags = flags;
         size_t i = 0;
-        while (i + 1 < times_.size() && static_cast<double>(times_[i]) < seconds * 10000000.0 + static_cast<double>(info_.firstTime))
+        while (i + 1 < times_.size() &&
+               static_cast<double>(times_[i]) < seconds * 10000000.0 + static_cast<double>(info_.firstTime))
             ++i;
         Show(i);
         return GetOffset();

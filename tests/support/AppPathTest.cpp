@@ -34,7 +34,7 @@ TEST(AppPath, BundleUrlsBecomeExecutableDirectories)
         {"file://localhost/a%2520b/", "/a%2520b"},  // one pass: no escape is decoded twice
         {"/opt/My%20Dir/", "/opt/My Dir"},          // no scheme: only the escape and the slash change
         {"", ""},
-        {"file://localhost/too/lon/", ""},          // 8 characters do not fit the 8 bytes below
+        {"file://localhost/too/lon/", ""},  // 8 characters do not fit the 8 bytes below
     };
     for (const auto& c : cases) {
         char path[64];

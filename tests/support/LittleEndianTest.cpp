@@ -15,7 +15,11 @@ using Bytes = std::vector<unsigned char>;
 // keeps more than its width.
 TEST(LittleEndian, LowByteFirstWithoutSignExtensionAndRoundTrips)
 {
-    const struct { uint32_t value; Bytes le16; Bytes le32; } cases[] = {
+    const struct {
+        uint32_t value;
+        Bytes le16;
+        Bytes le32;
+    } cases[] = {
         {0x12345678, {0x78, 0x56}, {0x78, 0x56, 0x34, 0x12}},
         {0xFFFF8001, {0x01, 0x80}, {0x01, 0x80, 0xFF, 0xFF}},
         {0x80000000, {0x00, 0x00}, {0x00, 0x00, 0x00, 0x80}},

@@ -10,10 +10,7 @@
 
 namespace {
 
-void Record(const char* line, void* context)
-{
-    static_cast<std::vector<std::string>*>(context)->push_back(line);
-}
+void Record(const char* line, void* context) { static_cast<std::vector<std::string>*>(context)->push_back(line); }
 
 // A format change of the audio converter prints two lines.
 void TraceFormatChange()
@@ -35,8 +32,9 @@ TEST(Trace, LinesGoToTheCallbackExactlyAsPrintedAndBackToStandardOutputWhenClear
     PCSetTraceCallback(nullptr, &lines);
     testing::internal::CaptureStdout();
     TraceFormatChange();
-    EXPECT_EQ(testing::internal::GetCapturedStdout(), " *** CAudioConverter::ChangeInput 1 => 2 channels.\r\n"
-                                                      " *** CAudioConverter::ChangeInput 44100 => 32000 Hz.\r\n");
+    EXPECT_EQ(testing::internal::GetCapturedStdout(),
+              " *** CAudioConverter::ChangeInput 1 => 2 channels.\r\n"
+              " *** CAudioConverter::ChangeInput 44100 => 32000 Hz.\r\n");
     EXPECT_EQ(lines.size(), 2u);
 }
 

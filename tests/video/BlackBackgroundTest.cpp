@@ -59,8 +59,8 @@ TEST(BlackBackground, ClearingAroundTheResizeEqualsClearingFirst)
         if (between(0, 3) == 0)
             length = whole - start;
     };
-    const IMAGE_INTERPOLATION interpolations[] = {INTERPOLATION_DEFAULT, INTERPOLATION_NEAREST,
-                                                  INTERPOLATION_BILINEAR, INTERPOLATION_BICUBIC, IMAGE_INTERPOLATION(7)};
+    const IMAGE_INTERPOLATION interpolations[] = {INTERPOLATION_DEFAULT, INTERPOLATION_NEAREST, INTERPOLATION_BILINEAR,
+                                                  INTERPOLATION_BICUBIC, IMAGE_INTERPOLATION(7)};
     for (int n = 0; n < 3000; ++n) {
         PaddedFrame picture(between(1, 24), between(1, 24), between(0, 3));
         const int width = between(1, 40), height = between(1, 40), padding = between(0, 5);
@@ -69,7 +69,8 @@ TEST(BlackBackground, ClearingAroundTheResizeEqualsClearingFirst)
             byte = static_cast<unsigned char>(random());
         for (size_t i = 0; i < cleared.bytes.size(); ++i)
             cleared.bytes[i] = around.bytes[i] = static_cast<unsigned char>(random());
-        IMG_PARAM src = {picture.frame.plane[0], picture.frame.width, picture.frame.height, picture.frame.pitch[0], 8, 0, 0, 0, 0};
+        IMG_PARAM src = {
+            picture.frame.plane[0], picture.frame.width, picture.frame.height, picture.frame.pitch[0], 8, 0, 0, 0, 0};
         span(picture.frame.width, src.x, src.cx);
         span(picture.frame.height, src.y, src.cy);
         IMG_PARAM dst = {cleared.frame.plane[0], width, height, cleared.frame.pitch[0], 8, 0, 0, 0, 0};
@@ -81,9 +82,9 @@ TEST(BlackBackground, ClearingAroundTheResizeEqualsClearingFirst)
         ImageResizeYUV(src, &picture.frame, dst, &cleared.frame, interpolation);
         ClearAround(around.frame, ImageResizeYV12Coverage(src, dst, interpolation));
         ImageResizeYUV(src, &picture.frame, dst, &around.frame, interpolation);
-        ASSERT_EQ(around.bytes, cleared.bytes) << "case " << n << ": " << width << "x" << height << " rect (" << dst.x
-                                               << "," << dst.y << ") " << dst.cx << "x" << dst.cy << " interpolation "
-                                               << interpolation;
+        ASSERT_EQ(around.bytes, cleared.bytes)
+            << "case " << n << ": " << width << "x" << height << " rect (" << dst.x << "," << dst.y << ") " << dst.cx
+            << "x" << dst.cy << " interpolation " << interpolation;
     }
 }
 

@@ -44,15 +44,9 @@ Bitmap Planar(int width, int height, unsigned char y, unsigned char u, unsigned 
     return bitmap;
 }
 
-Ints Size(const MEDIA_FRAME* frame)
-{
-    return frame != nullptr ? Ints{frame->width, frame->height} : Ints{};
-}
+Ints Size(const MEDIA_FRAME* frame) { return frame != nullptr ? Ints{frame->width, frame->height} : Ints{}; }
 
-unsigned char Luma(const MEDIA_FRAME* frame, int x, int y)
-{
-    return frame->plane[0][y * frame->pitch[0] + x];
-}
+unsigned char Luma(const MEDIA_FRAME* frame, int x, int y) { return frame->plane[0][y * frame->pitch[0] + x]; }
 
 TEST(FixedWatermark, SizesPlanesAndRefusals)
 {

@@ -30,7 +30,9 @@ int Stopped(int signal)
 {
     if (signal != SIGPIPE)
         std::fprintf(stderr, "avpost: interrupted by %s; no output file was left behind\n",
-                     signal == SIGINT ? "SIGINT" : signal == SIGTERM ? "SIGTERM" : "SIGHUP");
+                     signal == SIGINT    ? "SIGINT"
+                     : signal == SIGTERM ? "SIGTERM"
+                                         : "SIGHUP");
     return kSignalBase + signal;
 }
 

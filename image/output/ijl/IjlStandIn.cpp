@@ -34,10 +34,7 @@ struct ErrorTrap {
     std::jmp_buf jump;
 };
 
-[[noreturn]] void JumpToTrap(j_common_ptr codec)
-{
-    std::longjmp(reinterpret_cast<ErrorTrap*>(codec->err)->jump, 1);
-}
+[[noreturn]] void JumpToTrap(j_common_ptr codec) { std::longjmp(reinterpret_cast<ErrorTrap*>(codec->err)->jump, 1); }
 
 void DiscardMessage(j_common_ptr) {}
 

@@ -14,8 +14,7 @@ namespace {
 // A planar 4:2:0 picture whose pitches exceed its rows by different amounts.
 struct Planar {
     Planar(SceneBuffers& buffers, const Scene& s, bool destination)
-        : pitchY(s.width + 1 + static_cast<int>(s.offset % 5)),
-          pitchU((s.width + 1) / 2 + 3),
+        : pitchY(s.width + 1 + static_cast<int>(s.offset % 5)), pitchU((s.width + 1) / 2 + 3),
           pitchV((s.width + 1) / 2 + static_cast<int>(s.offset % 3))
     {
         const int chromaRows = (s.height + 1) / 2;
@@ -39,10 +38,7 @@ struct Member {
     SceneWork convert;
 };
 
-void PrintTo(const Member& member, std::ostream* os)
-{
-    *os << member.name;
-}
+void PrintTo(const Member& member, std::ostream* os) { *os << member.name; }
 class ConverterVariants : public ::testing::TestWithParam<Member> {};
 
 TEST_P(ConverterVariants, GiveTheReferenceBytesAtEveryLevel)

@@ -31,7 +31,9 @@ const auto kByName = [](const auto& info) { return std::string(info.param.name);
 struct GuardedPlane {
     GuardedPlane(int usedWidth, int rowCount, int rowPitch)
         : width(usedWidth), pitch(rowPitch), rows(rowCount),
-          buffer(2 * kMargin + static_cast<size_t>(rowPitch) * static_cast<size_t>(rowCount), F) {}
+          buffer(2 * kMargin + static_cast<size_t>(rowPitch) * static_cast<size_t>(rowCount), F)
+    {
+    }
     unsigned char* Data() { return buffer.data() + kMargin; }
     unsigned char& At(int x, int y) { return Data()[y * pitch + x]; }
     bool GuardsIntact() const
@@ -59,7 +61,9 @@ void ExpectRows(GuardedPlane& plane, const std::vector<Bytes>& rows)
 // another plane's pitch lands in the wrong place.
 struct Yuv420Planes {
     Yuv420Planes(int w, int h)
-        : y(w, h, w + 3), u((w + 1) / 2, (h + 1) / 2, (w + 1) / 2 + 1), v((w + 1) / 2, (h + 1) / 2, (w + 1) / 2 + 5) {}
+        : y(w, h, w + 3), u((w + 1) / 2, (h + 1) / 2, (w + 1) / 2 + 1), v((w + 1) / 2, (h + 1) / 2, (w + 1) / 2 + 5)
+    {
+    }
     bool GuardsIntact() const { return y.GuardsIntact() && u.GuardsIntact() && v.GuardsIntact(); }
     GuardedPlane y, u, v;
 };
@@ -68,9 +72,10 @@ struct Yuv420Planes {
 // A bitmap of 3 or 4 bytes per pixel (24-bit rows padded to four bytes) addressed by picture row.
 struct Bitmap : GuardedPlane {
     Bitmap(int w, int h, int pixelBytes, bool upsideDown)
-        : GuardedPlane(w * pixelBytes, h, pixelBytes == 3 ? (w * 3 + 3) & ~3 : w * 4),
-          bytes(pixelBytes),
-          bottomUp(upsideDown) {}
+        : GuardedPlane(w * pixelBytes, h, pixelBytes == 3 ? (w * 3 + 3) & ~3 : w * 4), bytes(pixelBytes),
+          bottomUp(upsideDown)
+    {
+    }
     unsigned char* Pixel(int x, int row) { return &At(x * bytes, bottomUp ? rows - 1 - row : row); }
     int bytes;
     bool bottomUp;
@@ -78,8 +83,13 @@ struct Bitmap : GuardedPlane {
 
 TEST(CoefficientTables, HoldTheMultiplesOfTheirCoefficient)
 {
-    for (const auto& [table, k] : {std::pair{mul_8258, 8258}, {mul_1606, 1606}, {mul_7193, 7193}, {mul_4768, 4768},
-                                   {mul_1163, 1163}, {mul_6660, 6660}, {mul_9536, 9536}})
+    for (const auto& [table, k] : {std::pair{mul_8258, 8258},
+                                   {mul_1606, 1606},
+                                   {mul_7193, 7193},
+                                   {mul_4768, 4768},
+                                   {mul_1163, 1163},
+                                   {mul_6660, 6660},
+                                   {mul_9536, 9536}})
         for (int i = 0; i < 256; ++i)
             ASSERT_EQ(table[i], k * i) << k << " " << i;
 }
@@ -132,7 +142,8 @@ TEST(SimpleMembers, AgreeWithTheTablePathOnTheEvenPartOnly)
         };
         EXPECT_TRUE(agree(simple.y.At(c, r), table.y.At(c, r), 1)) << c << "," << r;
         EXPECT_TRUE(agree(simple.u.At(c / 2, r / 2), table.u.At(c / 2, r / 2), 1) &&
-                    agree(simple.v.At(c / 2, r / 2), table.v.At(c / 2, r / 2), 1)) << c << "," << r;
+                    agree(simple.v.At(c / 2, r / 2), table.v.At(c / 2, r / 2), 1))
+            << c << "," << r;
         for (int k = 0; k < 3; ++k)
             EXPECT_TRUE(agree(simpleRgb.Pixel(c, r)[k], tableRgb.Pixel(c, r)[k], 2)) << c << "," << r;
     }
@@ -141,15 +152,26 @@ TEST(SimpleMembers, AgreeWithTheTablePathOnTheEvenPartOnly)
 
 // Colours as stored (blue, green, red) with their table-path Y and unbiased chroma (the U and V of
 // a uniform block less 128).
-struct KnownColour { unsigned char b, g, r; int y, du, dv; };
-const KnownColour kPalette[] = {{255, 255, 255, 235, 0, 0}, {0, 0, 0, 16, 0, 0}, {0, 0, 255, 81, -38, 111},
-                                {0, 255, 0, 144, -75, -94}, {255, 0, 0, 40, 111, -19}};
+struct KnownColour {
+    unsigned char b, g, r;
+    int y, du, dv;
+};
+const KnownColour kPalette[] = {{255, 255, 255, 235, 0, 0},
+                                {0, 0, 0, 16, 0, 0},
+                                {0, 0, 255, 81, -38, 111},
+                                {0, 255, 0, 144, -75, -94},
+                                {255, 0, 0, 40, 111, -19}};
 
 // Every member is called with the arguments of Rgb32_2_yuv420A_R; those without an alpha plane drop pA.
 #define WITHOUT_ALPHA(call) [](auto y, auto u, auto v, auto, auto py, auto pu, auto pv, auto h, auto s) { call; }
 
 // alpha: the member is given an alpha plane (otherwise a null pA).
-struct Member { const char* name; int bytes; bool bottomUp, alpha; decltype(&Rgb32_2_yuv420A_R) convert; };
+struct Member {
+    const char* name;
+    int bytes;
+    bool bottomUp, alpha;
+    decltype(&Rgb32_2_yuv420A_R) convert;
+};
 const Member kMembers[] = {
     {"Rgb24_2_yuv420", 3, true, false, WITHOUT_ALPHA(Rgb24_2_yuv420(y, u, v, py, pu, pv, h, s))},
     {"Rgb32_2_yuv420", 4, true, false, WITHOUT_ALPHA(Rgb32_2_yuv420(y, u, v, py, pu, pv, h, s))},
@@ -193,8 +215,8 @@ TEST_P(PlanarRgbMembers, ConvertEveryPixelByTheBlockAndEdgeRulesAndBack)
             luma[i] = colour.y, sumU[k] += colour.du, sumV[k] += colour.dv, ++count[k];
         }
         tagBITMAPINFOHEADER header = BitmapHeader(w, h, m.bytes * 8);
-        m.convert(yuv.y.Data(), yuv.u.Data(), yuv.v.Data(), m.alpha ? alpha.Data() : nullptr, yuv.y.pitch,
-                  yuv.u.pitch, yuv.v.pitch, &header, rgb.Data());
+        m.convert(yuv.y.Data(), yuv.u.Data(), yuv.v.Data(), m.alpha ? alpha.Data() : nullptr, yuv.y.pitch, yuv.u.pitch,
+                  yuv.v.pitch, &header, rgb.Data());
         (m.bytes == 3 ? Yuv420_2_rgb24 : m.bottomUp ? Yuv420_2_rgb32 : Yuv420_2_Argb)(&header, out.Data(), PLANES(yuv));
 
         for (int i = 0; i < w * h; ++i) {
@@ -274,7 +296,8 @@ TEST_P(PackedFormats, PlanarToPacked)
     for (int i = 0; i < 12; ++i)
         src.y.At(i % 4, i / 4) = static_cast<unsigned char>(i + 1);
     for (int i = 0; i < 4; ++i)
-        src.u.At(i % 2, i / 2) = static_cast<unsigned char>(90 + i), src.v.At(i % 2, i / 2) = static_cast<unsigned char>(240 - i);
+        src.u.At(i % 2, i / 2) = static_cast<unsigned char>(90 + i),
+                            src.v.At(i % 2, i / 2) = static_cast<unsigned char>(240 - i);
     GuardedPlane dst = Packed(3, {{}, {}, {}, {}});
     Yuv420_2_YUY2(dst.Data(), dst.pitch, 1, 0, 4, 3, f, PLANES(src), 0, 0);
     ExpectRows(dst, {InOrder(f, {F, F, 1, 240, 2, 90, 3, 239, 4, 91, F, F}),
@@ -314,7 +337,8 @@ TEST(PlanarCopy, ChromaStartsAtTheRoundedUpColumnAndTheHalvedRow)
     for (int i = 0; i < 64; ++i)
         src.y.At(i % 8, i / 8) = static_cast<unsigned char>(i);
     for (int i = 0; i < 16; ++i)
-        src.u.At(i % 4, i / 4) = static_cast<unsigned char>(100 + i), src.v.At(i % 4, i / 4) = static_cast<unsigned char>(200 + i);
+        src.u.At(i % 4, i / 4) = static_cast<unsigned char>(100 + i),
+                            src.v.At(i % 4, i / 4) = static_cast<unsigned char>(200 + i);
     YV12_Blt_fast(PLANES(dst), 0, 0, 3, 3, PLANES(src), 3, 4);
     ExpectRows(dst.y, {{35, 36, 37, F}, {43, 44, 45, F}, {51, 52, 53, F}});
     ExpectRows(dst.u, {{110, F}, {114, F}});
@@ -348,7 +372,11 @@ const char* const kDstBuffers = "lpDstBits && pY && pU && pV";
 const char* const kPackedBuffers = "lpBitsDst && lpBitsSrc";
 const char* const kVBound = "(char*)V <= ((char*)pV + (ySrc + cy) * nPt_V)";
 
-struct Case { const char* name; void (*call)(); const char* expression; };
+struct Case {
+    const char* name;
+    void (*call)();
+    const char* expression;
+};
 
 // Where both checks of a member would fail, the first one is reported.
 const Case kCases[] = {

@@ -21,10 +21,7 @@ namespace {
 using Bytes = std::vector<unsigned char>;
 
 // The documented steps on one sample, in 64 bits as they are defined.
-int Clamped(int64_t value, int low, int high)
-{
-    return static_cast<int>(std::clamp<int64_t>(value, low, high));
-}
+int Clamped(int64_t value, int low, int high) { return static_cast<int>(std::clamp<int64_t>(value, low, high)); }
 
 int Stretched(int value, int64_t percent, int low, int high)
 {
@@ -182,10 +179,7 @@ struct Effect {
     void (*apply)(MEDIA_FRAME*);
 };
 
-void PrintTo(const Effect& effect, std::ostream* os)
-{
-    *os << effect.name;
-}
+void PrintTo(const Effect& effect, std::ostream* os) { *os << effect.name; }
 class InPlaceEffectVariants : public ::testing::TestWithParam<Effect> {};
 
 // Taller pictures than the scenes', so that every deinterlacing style rebuilds chroma rows too.

@@ -48,13 +48,16 @@ public:
     unsigned char& At(int plane, int x, int y) { return bytes_[offset_[plane] + y * width_[plane] + x]; }
     Samples Plane(int i) const { return {&bytes_[offset_[i]], &bytes_[offset_[i]] + Size(i)}; }
     void SetPlane(int i, const Samples& values) { std::copy(values.begin(), values.end(), &At(i, 0, 0)); }
-    bool GuardsIntact() const { return std::all_of(offset_, offset_ + 5, [this](size_t end) { return Intact(end); }); }
+    bool GuardsIntact() const
+    {
+        return std::all_of(offset_, offset_ + 5, [this](size_t end) { return Intact(end); });
+    }
 
 private:
     size_t Size(int i) const { return offset_[i + 1] - kGuard - offset_[i]; }
     bool Intact(size_t end) const { return std::count(&bytes_[end - kGuard], &bytes_[end - 1] + 1, kMark) == kGuard; }
 
-    static constexpr int kGuard = 32;          // bytes before each plane and at the end
+    static constexpr int kGuard = 32;             // bytes before each plane and at the end
     static constexpr unsigned char kMark = 0xA5;  // what they hold
     int width_[4];
     size_t offset_[5] = {};  // where each plane starts, and the end of the buffer
@@ -86,7 +89,7 @@ TEST(PictureAdjustments, DocumentedValuesClampsOrderAndChromaCoverage)
 {
     // Brightness, contrast, saturation; luma before and after; chroma before and after.
     const int cases[][7] = {
-        {10, 0, 0, 230, 235, 250, 250},     {-300, 0, 0, 200, 16, 128, 128},   // brightness leaves chroma
+        {10, 0, 0, 230, 235, 250, 250},     {-300, 0, 0, 200, 16, 128, 128},  // brightness leaves chroma
         {0, 100, 0, 200, 235, 200, 240},    {0, 100, 0, 100, 72, 100, 72},
         {0, 50, 0, 127, 127, 100, 86},      {0, -100, 0, 17, 128, 240, 128},   // -14 truncated toward 0
         {0, 0, 10, 250, 250, 160, 169},     {0, 0, -10, 50, 50, 160, 157},     // only positive ones tripled
@@ -148,13 +151,20 @@ TEST(Deinterlace, EachStyleOnOneToFiveRows)
     // Style, height and the luma and chroma rows afterwards.
     const Samples luma = {10, 200, 13, 220, 90}, chroma = {100, 7, 180};
     const std::tuple<int, int, Samples, Samples> cases[] = {
-        {1, 4, {10, 10, 13, 13}, {100, 100}},  {1, 5, {10, 10, 13, 13, 90}, {100, 100, 180}},
-        {2, 4, {200, 200, 220, 220}, {7, 7}},  {2, 5, {200, 200, 220, 220, 90}, {7, 7, 180}},
-        {3, 4, {10, 11, 13, 220}, {100, 7}},   {3, 5, {10, 11, 13, 51, 90}, {100, 140, 180}},  // truncating
-        {4, 4, {10, 200, 210, 220}, {100, 7}}, {4, 5, {10, 200, 210, 220, 90}, {100, 7, 180}},
-        {0, 5, luma, chroma},                  {5, 5, luma, chroma},
-        {-1, 5, luma, chroma},                 {1, 2, {10, 10}, {100}},  // one chroma row
-        {4, 2, {10, 200}, {100}},              {3, 1, {10}, {100}},
+        {1, 4, {10, 10, 13, 13}, {100, 100}},
+        {1, 5, {10, 10, 13, 13, 90}, {100, 100, 180}},
+        {2, 4, {200, 200, 220, 220}, {7, 7}},
+        {2, 5, {200, 200, 220, 220, 90}, {7, 7, 180}},
+        {3, 4, {10, 11, 13, 220}, {100, 7}},
+        {3, 5, {10, 11, 13, 51, 90}, {100, 140, 180}},  // truncating
+        {4, 4, {10, 200, 210, 220}, {100, 7}},
+        {4, 5, {10, 200, 210, 220, 90}, {100, 7, 180}},
+        {0, 5, luma, chroma},
+        {5, 5, luma, chroma},
+        {-1, 5, luma, chroma},
+        {1, 2, {10, 10}, {100}},  // one chroma row
+        {4, 2, {10, 200}, {100}},
+        {3, 1, {10}, {100}},
     };
     for (const auto& [style, height, lumaAfter, chromaAfter] : cases) {
         auto deinterlace = [style = style](MEDIA_FRAME* f) { DeinterlaceImage(f, DEINTERLACE_STYLE(style)); };
@@ -183,7 +193,7 @@ TEST(AddWaterMark, LevelsAlphaAndTheTwoRoundings)
     // Level, watermark alpha, frame and watermark sample, and the result through a rectangle (one
     // division for every plane), and by alignment: luma (two divisions) and chroma (one).
     const int cases[][7] = {
-        {100, 255, 100, 200, 200, 200, 200}, {0, 255, 100, 200, 100, 100, 100}, {100, 0, 100, 200, 100, 100, 100},
+        {100, 255, 100, 200, 200, 200, 200}, {0, 255, 100, 200, 100, 100, 100},  {100, 0, 100, 200, 100, 100, 100},
         {50, 255, 100, 200, 149, 149, 149},  {50, 255, 1, 1, 1, 0, 1},           {45, 255, 99, 201, 144, 143, 144},
         {150, 255, 100, 200, 200, 200, 200}, {-20, 255, 100, 200, 100, 100, 100}};
     const tagRECT whole{0, 0, 4, 4};
@@ -194,8 +204,7 @@ TEST(AddWaterMark, LevelsAlphaAndTheTwoRoundings)
         const std::vector<Samples> frame = {Samples(16, c[2]), Samples(4, c[2]), Samples(4, 128)};
         const auto once = After([&](MEDIA_FRAME* f) { AddWaterMark(f, mark.frame(), &whole, c[0], 0); }, 4, frame);
         const auto aligned = After([&](MEDIA_FRAME* f) { AddWaterMark(f, mark.frame(), nullptr, c[0], 1); }, 4, frame);
-        EXPECT_EQ(std::tuple(once[0][5], once[1][3], aligned[0][5], aligned[1][0]),
-                  std::tuple(c[4], c[4], c[5], c[6]))
+        EXPECT_EQ(std::tuple(once[0][5], once[1][3], aligned[0][5], aligned[1][0]), std::tuple(c[4], c[4], c[5], c[6]))
             << "level " << c[0] << ", under " << c[2];
     }
 }
@@ -209,7 +218,7 @@ TEST(AddWaterMark, RectangleClipsWithoutScalingAndChromaFollowsTheFrame)
     const tagRECT rect{-9, -1, 3, 99};
     AddWaterMark(frame.frame(), mark.frame(), &rect, 100, 0);
     EXPECT_EQ(frame.Plane(0), (Samples{129, 130, 131, 16, 16, 16, 16, 16, 149, 150, 151, 16, 16, 16, 16, 16,
-                                       169, 170, 171, 16, 16, 16, 16, 16, 16, 16, 16, 16, 16, 16, 16, 16}));
+                                       169, 170, 171, 16, 16, 16, 16, 16, 16,  16,  16,  16, 16, 16, 16, 16}));
     EXPECT_EQ(frame.Plane(1), (Samples{54, 55, 128, 128, 64, 65, 128, 128}));
     EXPECT_TRUE(frame.GuardsIntact());
     // A negative start inside the watermark, or no watermark, draws nothing.
@@ -222,7 +231,7 @@ TEST(AddWaterMark, RectangleClipsWithoutScalingAndChromaFollowsTheFrame)
 TEST(AddWaterMark, AlignmentCodesPlaceTheWatermarkSkipItsLastRowAndClip)
 {
     // Frame 10 x 8, watermark 4 x 3: centre (3, 2), right column 6, bottom row 5 (chroma row 3).
-    const int positions[][3] = {{0, 3, 2}, {1, 0, 0}, {2, 3, 0}, {3, 6, 0}, {4, 0, 2}, {5, 3, 2},
+    const int positions[][3] = {{0, 3, 2}, {1, 0, 0}, {2, 3, 0}, {3, 6, 0}, {4, 0, 2},  {5, 3, 2},
                                 {6, 6, 2}, {7, 0, 5}, {8, 3, 5}, {9, 6, 5}, {42, 0, 0}, {-3, 0, 0}};
     GuardedPicture mark = Gradient(4, 3), large = Gradient(9, 7);
     for (const auto& [align, left, top] : positions) {

@@ -28,9 +28,15 @@ TEST_F(StandIn, DecodesToTheSizeRowOrderAndColoursItWasGiven)
     const struct {
         Kind kind;
         int width, height;
-    } cases[] = {{Kind::kWrappersGradient, 100, 75}, {Kind::kWrappersGradient, 101, 75}, {Kind::kGradient, 1, 1},
-                 {Kind::kGradient, 10, 10},          {Kind::kGradient, 7, 3},             {Kind::kGradient, 17, 9},
-                 {Kind::kGradient, 64, 48},          {Kind::kGradient, 5, 33},            {Kind::kCheckerboard, 16, 8}};
+    } cases[] = {{Kind::kWrappersGradient, 100, 75},
+                 {Kind::kWrappersGradient, 101, 75},
+                 {Kind::kGradient, 1, 1},
+                 {Kind::kGradient, 10, 10},
+                 {Kind::kGradient, 7, 3},
+                 {Kind::kGradient, 17, 9},
+                 {Kind::kGradient, 64, 48},
+                 {Kind::kGradient, 5, 33},
+                 {Kind::kCheckerboard, 16, 8}};
     for (const auto& c : cases) {
         SCOPED_TRACE(std::to_string(c.width) + " x " + std::to_string(c.height));
         DibImage picture, decoded;

@@ -130,22 +130,14 @@ TEST(JpegScan, PinnedFilesAcrossSizes)
         Content content;
         uint64_t hash;
     } cases[] = {
-        {1, 1, Content::kNoise, 4202928657668981349ull},
-        {8, 8, Content::kNoise, 2096077637085012109ull},
-        {9, 7, Content::kNoise, 2546781633652468741ull},
-        {64, 48, Content::kNoise, 4746689434414567178ull},
-        {67, 33, Content::kNoise, 17353925480773855651ull},
-        {1, 37, Content::kNoise, 8583439818104409794ull},
-        {203, 1, Content::kNoise, 5750935098234129895ull},
-        {16, 16, Content::kGradient, 7062311530282425889ull},
-        {161, 95, Content::kGradient, 4027701855513303729ull},
-        {320, 240, Content::kGradient, 4124311777100302406ull},
-        {8, 8, Content::kChecks, 15888048445037434470ull},
-        {77, 41, Content::kChecks, 15492450617705220120ull},
-        {24, 24, Content::kSaturated, 14861674594231001901ull},
-        {99, 51, Content::kSaturated, 1968099523827378989ull},
-        {64, 64, Content::kBasis, 6607009278063751447ull},
-        {203, 99, Content::kBasis, 15099398329717187023ull},
+        {1, 1, Content::kNoise, 4202928657668981349ull},        {8, 8, Content::kNoise, 2096077637085012109ull},
+        {9, 7, Content::kNoise, 2546781633652468741ull},        {64, 48, Content::kNoise, 4746689434414567178ull},
+        {67, 33, Content::kNoise, 17353925480773855651ull},     {1, 37, Content::kNoise, 8583439818104409794ull},
+        {203, 1, Content::kNoise, 5750935098234129895ull},      {16, 16, Content::kGradient, 7062311530282425889ull},
+        {161, 95, Content::kGradient, 4027701855513303729ull},  {320, 240, Content::kGradient, 4124311777100302406ull},
+        {8, 8, Content::kChecks, 15888048445037434470ull},      {77, 41, Content::kChecks, 15492450617705220120ull},
+        {24, 24, Content::kSaturated, 14861674594231001901ull}, {99, 51, Content::kSaturated, 1968099523827378989ull},
+        {64, 64, Content::kBasis, 6607009278063751447ull},      {203, 99, Content::kBasis, 15099398329717187023ull},
     };
     ScratchDir dir;
     for (avpost::simd::Level level : AvailableSimdLevels()) {
@@ -154,7 +146,7 @@ TEST(JpegScan, PinnedFilesAcrossSizes)
             DibImage image;
             PaintContent(image, c.width, c.height, c.content);
             EXPECT_EQ(Fnv1a(EncodeJpeg(image, dir)), c.hash) << avpost::simd::NameOf(level) << ", " << c.width << "x"
-                                                              << c.height << " content " << static_cast<int>(c.content);
+                                                             << c.height << " content " << static_cast<int>(c.content);
         }
     }
 }
@@ -167,8 +159,12 @@ TEST(JpegRefusals, WhatItCannotUseWritesNothing)
     const std::string bmp = dir.File("bad.bmp"), jpeg = dir.File("out.jpg"), good = dir.File("picture.bmp");
     EncodeGrey(10, 7, dir);
     const Bytes goodFile = avpost_test::ReadFile(good);
-    Bytes bad[6] = {goodFile, goodFile, goodFile, Bytes(goodFile.begin(), goodFile.begin() + 53),
-                    Bytes(goodFile.begin(), goodFile.end() - 1), Bytes(goodFile.begin(), goodFile.begin() + 54)};
+    Bytes bad[6] = {goodFile,
+                    goodFile,
+                    goodFile,
+                    Bytes(goodFile.begin(), goodFile.begin() + 53),
+                    Bytes(goodFile.begin(), goodFile.end() - 1),
+                    Bytes(goodFile.begin(), goodFile.begin() + 54)};
     bad[0][28] = 8;
     bad[1][28] = 32;
     bad[2][0] = 'X';

@@ -25,9 +25,9 @@ TEST(JpegTransform, QuantisationRoundsHalvesUpward)
         float coefficient, divisor;
         short expected;
     } cases[] = {
-        {2.5f, 1.0f, 3},   {-2.5f, 1.0f, -2}, {3.5f, 1.0f, 4},         {-3.5f, 1.0f, -3},
-        {-0.5f, 1.0f, 0},  {0.5f, 1.0f, 1},   {0.49999997f, 1.0f, 0},  {-0.50000006f, 1.0f, -1},
-        {7.0f, 0.5f, 4},   {-7.0f, 0.5f, -3}, {-1000.0f, 0.125f, -125}, {1e-30f, 1.0f, 0},
+        {2.5f, 1.0f, 3},  {-2.5f, 1.0f, -2}, {3.5f, 1.0f, 4},          {-3.5f, 1.0f, -3},
+        {-0.5f, 1.0f, 0}, {0.5f, 1.0f, 1},   {0.49999997f, 1.0f, 0},   {-0.50000006f, 1.0f, -1},
+        {7.0f, 0.5f, 4},  {-7.0f, 0.5f, -3}, {-1000.0f, 0.125f, -125}, {1e-30f, 1.0f, 0},
     };
     for (const auto& c : cases)
         EXPECT_EQ(QuantizeCoefficient(c.coefficient, c.divisor), c.expected) << c.coefficient << " x " << c.divisor;
@@ -65,11 +65,12 @@ Transformed Active(const signed char* samples, int blocks, const float* divisors
 // The divisors a conversion uses: 1 / (q x a[row] x a[col] x 8) for quantisers q from 5 to 50.
 std::vector<float> EncoderLikeDivisors(std::mt19937& random)
 {
-    constexpr double scale[8] = {1.0,         1.387039845, 1.306562965, 1.175875602,
-                                 1.0,         0.785694958, 0.541196100, 0.275899379};
+    constexpr double scale[8] = {1.0, 1.387039845, 1.306562965, 1.175875602,
+                                 1.0, 0.785694958, 0.541196100, 0.275899379};
     std::vector<float> divisors(64);
     for (int i = 0; i < 64; ++i)
-        divisors[i] = static_cast<float>(1.0 / (static_cast<double>(5 + random() % 46) * scale[i / 8] * scale[i % 8] * 8.0));
+        divisors[i] =
+            static_cast<float>(1.0 / (static_cast<double>(5 + random() % 46) * scale[i / 8] * scale[i % 8] * 8.0));
     return divisors;
 }
 

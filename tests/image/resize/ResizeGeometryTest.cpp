@@ -8,7 +8,9 @@ namespace {
 
 using Rect = std::array<int, 4>;  // x, y, cx, cy
 
-struct Decision { Rect src, dst; };
+struct Decision {
+    Rect src, dst;
+};
 
 Decision Decide(int aspectX, int aspectY, int srcW, int srcH, tagRECT crop, int dstW, int dstH, int method)
 {

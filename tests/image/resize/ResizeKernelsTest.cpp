@@ -49,7 +49,8 @@ public:
     bool GuardsIntact() const
     {
         return std::count(storage_.begin(), storage_.begin() + guard_, kGuard) +
-                   std::count(storage_.end() - guard_, storage_.end(), kGuard) == 2 * guard_;
+                   std::count(storage_.end() - guard_, storage_.end(), kGuard) ==
+               2 * guard_;
     }
 
 private:
@@ -65,7 +66,10 @@ int Resize(Kernel kernel, const IMG_PARAM& src, IMG_PARAM dst) { return kernel(s
 
 // A dispatcher with a fixed interpolation, used as a kernel.
 template <int (*dispatch)(const IMG_PARAM&, IMG_PARAM&, IMAGE_INTERPOLATION), IMAGE_INTERPOLATION interpolation>
-int Via(const IMG_PARAM& src, IMG_PARAM& dst) { return dispatch(src, dst, interpolation); }
+int Via(const IMG_PARAM& src, IMG_PARAM& dst)
+{
+    return dispatch(src, dst, interpolation);
+}
 
 // How a kernel lays out rows, and what it does at equal sizes.
 enum Rows { BottomUp, TopDown, Chroma };
@@ -73,7 +77,14 @@ enum EqualSize { Copies, CopiesPaintingMargins, Transforms };
 
 // Bytes per pixel of the source and the destination, and a dispatcher route to the kernel (the
 // kernel itself where no dispatcher leads to it).
-struct KernelCase { const char* name; Kernel kernel; int srcBytes, dstBytes; Rows rows; EqualSize equal; Kernel via; };
+struct KernelCase {
+    const char* name;
+    Kernel kernel;
+    int srcBytes, dstBytes;
+    Rows rows;
+    EqualSize equal;
+    Kernel via;
+};
 
 #define KERNEL(function) #function, function
 const KernelCase kKernels[] = {
@@ -159,7 +170,15 @@ TEST(ResizeDispatch, RefusesWhatALayoutDoesNotOffer)
 
 // A worked case of an 8-bit plane kernel: source and destination size and rectangle (x, y, cx,
 // cy), and every byte of the destination (filled with 0x33 before) afterwards.
-struct PlaneCase { Kernel kernel; int srcW, srcH; Bytes src; int from[4]; int dstW, dstH; int to[4]; Bytes expected; };
+struct PlaneCase {
+    Kernel kernel;
+    int srcW, srcH;
+    Bytes src;
+    int from[4];
+    int dstW, dstH;
+    int to[4];
+    Bytes expected;
+};
 
 constexpr unsigned char o = 0x33;
 // 10 x row + column, the last pixel one more, beside two columns of 255 outside the rectangles.
@@ -171,10 +190,24 @@ TEST(PlaneResize, WorkedCases)
         // 2 -> 4: step 1365, column 1 weighs the source 2731 : 1365 and row 1 likewise; the last
         // column (position 4095) is blended too and falls short of 240; the last row copies
         // source row 1 at column 0.
-        {Via<ImageResizeY, INTERPOLATION_DEFAULT>, 2, 2, {0, 240, 120, 240}, {0, 0, 2, 2}, 4, 4, {0, 0, 4, 4},
+        {Via<ImageResizeY, INTERPOLATION_DEFAULT>,
+         2,
+         2,
+         {0, 240, 120, 240},
+         {0, 0, 2, 2},
+         4,
+         4,
+         {0, 0, 4, 4},
          {0, 79, 159, 239, 39, 105, 172, 239, 79, 132, 185, 239, 120, 120, 120, 120}},
         // Nearest 8-bit rounds: 5 columns into 3 take 0, (5 + 1) / 3 = 2 and the last.
-        {Via<ImageResize8, INTERPOLATION_NEAREST>, 6, 4, kRamp, {0, 2, 5, 2}, 3, 2, {0, 0, 3, 2},
+        {Via<ImageResize8, INTERPOLATION_NEAREST>,
+         6,
+         4,
+         kRamp,
+         {0, 2, 5, 2},
+         3,
+         2,
+         {0, 0, 3, 2},
          {20, 22, 255, 30, 32, 255}},
         // Five-fold: column 8 rounds onto column 2, one past the rectangle but inside the picture,
         // and reads it; the last column is the rectangle's own.
@@ -189,14 +222,29 @@ TEST(PlaneResize, WorkedCases)
         {DIB_ResizeBiLinerY_Simulate, 6, 4, kRamp, {0, 0, 4, 4}, 2, 2, {0, 0, 2, 2}, {16, 18, 30, 34}},
         // The chroma of 4 x 4 into that of 5 x 5: step 3072, so chroma column 1 (luma 2) sits at
         // luma column 1 + 2048 / 4096, and likewise row 1; the last row is copied.
-        {Via<ImageResizeUV, INTERPOLATION_BILINEAR>, 2, 2, {10, 50, 90, 130}, {0, 0, 4, 4}, 3, 3, {0, 0, 5, 5},
+        {Via<ImageResizeUV, INTERPOLATION_BILINEAR>,
+         2,
+         2,
+         {10, 50, 90, 130},
+         {0, 0, 4, 4},
+         3,
+         3,
+         {0, 0, 5, 5},
          {10, 30, 50, 50, 70, 90, 90, 90, 130}},
         // Nearest, from a rectangle two luma columns in.
-        {Via<ImageResizeUV, INTERPOLATION_NEAREST>, 3, 2, {5, 10, 50, 7, 90, 130}, {2, 0, 4, 4}, 3, 3, {0, 0, 5, 5},
+        {Via<ImageResizeUV, INTERPOLATION_NEAREST>,
+         3,
+         2,
+         {5, 10, 50, 7, 90, 130},
+         {2, 0, 4, 4},
+         3,
+         3,
+         {0, 0, 5, 5},
          {10, 10, 50, 10, 10, 50, 90, 90, 130}},
         // Luma rectangle (2, 2) 6 x 4 of a 10 x 8 picture: chroma columns 1...3 of rows 1 and 2 only.
-        {DIB_ResizeBiLinerUV, 3, 3, Bytes(9, 77), {0, 0, 3, 3}, 5, 4, {2, 2, 6, 4},
-         {o, o, o, o, o, o, 77, 77, 77, o, o, 77, 77, 77, o, o, o, o, o, o}},
+        {DIB_ResizeBiLinerUV, 3, 3, Bytes(9, 77), {0, 0, 3, 3}, 5, 4, {2, 2, 6, 4}, {o,  o,  o, o, o,  o,  77,
+                                                                                     77, 77, o, o, 77, 77, 77,
+                                                                                     o,  o,  o, o, o,  o}},
     };
     for (const PlaneCase& c : cases) {
         TestPicture src(c.srcW, c.srcH, 1), dst(c.dstW, c.dstH, 1, o);
@@ -213,10 +261,13 @@ TEST(DibResize, BilinearAndAlphaCompositeWorkedCase)
     // 2 x 2 into 4 x 4: steps 1365, so output (1, 1) weighs its upper-left source pixel 2731 and
     // the neighbours 1365. Picture row 0 is the last row in memory.
     TestPicture src(2, 2, 4), plain(4, 4, 4), over(4, 4, 4, 200);
-    auto pixel = [](TestPicture& p, int row, int c) { auto* b = &p.AtBottomUp(row, 4 * c); return Bytes(b, b + 4); };
+    auto pixel = [](TestPicture& p, int row, int c) {
+        auto* b = &p.AtBottomUp(row, 4 * c);
+        return Bytes(b, b + 4);
+    };
     src.SetContents({0, 0, 0, 64, 240, 0, 0, 0, 0, 100, 200, 128, 240, 100, 0, 255});
     ASSERT_EQ(Resize(Via<ImageResize, INTERPOLATION_BILINEAR>, src.Whole(), plain.Whole()), 1);
-    EXPECT_EQ(pixel(plain, 1, 1), (Bytes{79, 66, 88, 128}));  // alpha of the upper-left
+    EXPECT_EQ(pixel(plain, 1, 1), (Bytes{79, 66, 88, 128}));   // alpha of the upper-left
     EXPECT_EQ(pixel(plain, 0, 3), (Bytes{240, 100, 0, 255}));  // last column copied
     EXPECT_EQ(pixel(plain, 3, 1), (Bytes{0, 0, 0, 64}));       // last row copied
     EXPECT_EQ(pixel(plain, 3, 3), (Bytes{240, 0, 0, 0}));
@@ -263,9 +314,13 @@ TEST(BicubicResize, WorkedCases)
 
 TEST(MaskResize, BilinearScalesTheAlphaNearestReplacesItZeroClears)
 {
-    const std::tuple<Kernel, int, int, int> cases[] = {  // kernel, mask, mask bits, alpha from 200
-        {Via<ImageStretchMask, INTERPOLATION_NEAREST>, 100, 8, 100 * 200 / 255}, {StretchMaskResizeNear, 100, 8, 100},
-        {StretchMaskResizeBiLiner, 100, 32, 78}, {StretchMaskResizeBiLiner, 0, 8, 0}, {StretchMaskResizeNear, 0, 8, 0}};
+    const std::tuple<Kernel, int, int, int> cases[] = {
+        // kernel, mask, mask bits, alpha from 200
+        {Via<ImageStretchMask, INTERPOLATION_NEAREST>, 100, 8, 100 * 200 / 255},
+        {StretchMaskResizeNear, 100, 8, 100},
+        {StretchMaskResizeBiLiner, 100, 32, 78},
+        {StretchMaskResizeBiLiner, 0, 8, 0},
+        {StretchMaskResizeNear, 0, 8, 0}};
     for (const auto& [kernel, value, bits, alpha] : cases) {
         TestPicture mask(3, 3, bits / 8), dst(4, 4, 4, 200);
         for (int i = 1; i <= 9; ++i)

@@ -35,10 +35,10 @@ struct KernelCase {
 
 #define KERNEL(function) #function, function
 const KernelCase kKernels[] = {
-    {KERNEL(DIB_ResizeNearY), Layout::Plane, 2},    {KERNEL(DIB_ResizeBiLinerY), Layout::Plane, 2},
-    {KERNEL(DIB_ResizeNearUV), Layout::Chroma, 2},  {KERNEL(DIB_ResizeBiLinerUV), Layout::Chroma, 2},
-    {KERNEL(DIB_ResizeNear), Layout::Rgba, 2},      {KERNEL(DIB_ResizeBiLiner), Layout::Rgba, 2},
-    {KERNEL(DIB_ResizeNear8), Layout::Grey, 1},     {KERNEL(DIB_ResizeBiLiner8), Layout::Grey, 2},
+    {KERNEL(DIB_ResizeNearY), Layout::Plane, 2},   {KERNEL(DIB_ResizeBiLinerY), Layout::Plane, 2},
+    {KERNEL(DIB_ResizeNearUV), Layout::Chroma, 2}, {KERNEL(DIB_ResizeBiLinerUV), Layout::Chroma, 2},
+    {KERNEL(DIB_ResizeNear), Layout::Rgba, 2},     {KERNEL(DIB_ResizeBiLiner), Layout::Rgba, 2},
+    {KERNEL(DIB_ResizeNear8), Layout::Grey, 1},    {KERNEL(DIB_ResizeBiLiner8), Layout::Grey, 2},
 };
 
 // A picture and its working rectangle, in pixels (luma units for a chroma plane).
@@ -73,8 +73,8 @@ size_t Span(Layout layout, const Geometry& g, bool whole)
 
 IMG_PARAM Describe(Layout layout, const Geometry& g, unsigned char* bits)
 {
-    return {bits, g.width, g.height, RowBytes(layout, g.width) + g.padding, layout == Layout::Rgba ? 32 : 8,
-            g.x, g.y, g.cx, g.cy};
+    return {bits, g.width, g.height, RowBytes(layout, g.width) + g.padding, layout == Layout::Rgba ? 32 : 8, g.x,
+            g.y,  g.cx,    g.cy};
 }
 
 // The destination bytes after the kernel ran at `level` over a copy of `before`; guards checked.
@@ -126,9 +126,14 @@ Geometry RandomGeometry(std::mt19937& random, int maxWidth, int maxHeight, int s
         start = between(0, whole - smallest);
         length = between(smallest, whole - start);
         switch (between(0, 2)) {
-        case 0: length += start, start = 0; break;
-        case 1: length = whole - start; break;
-        default: break;
+        case 0:
+            length += start, start = 0;
+            break;
+        case 1:
+            length = whole - start;
+            break;
+        default:
+            break;
         }
     };
     Geometry g{between(smallest, maxWidth), between(smallest, maxHeight), 0, 0, 0, 0, between(0, 9), between(0, 63)};

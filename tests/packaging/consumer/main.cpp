@@ -40,8 +40,7 @@ int main(int argc, char** argv)
     VideoDecoder* stage = PEVideoCreate(&decoder, 50.0);
     if (stage == nullptr || stage->GetFrame() == nullptr || stage->GetStreamInfo()->video.frameRate != 50.0)
         return 1;
-    bool ok = stage->Forward(1) == 1 && stage->GetFrame() != nullptr &&
-              stage->GetFrame()->startTime == 200000;
+    bool ok = stage->Forward(1) == 1 && stage->GetFrame() != nullptr && stage->GetFrame()->startTime == 200000;
     PEVideoDestroy(stage);
     // The JPEG library, when it was built, is installed beside libavpost.so and found there.
     const bool needsJpegLibrary = argc > 1 && std::strcmp(argv[1], "--jpeg-library") == 0;

@@ -23,10 +23,7 @@ void encode(const MEDIA_FRAME* picture)
         readme::g_firstStart = picture->startTime;
 }
 
-void mux(const unsigned char*, int bytes)
-{
-    readme::g_muxedBytes += bytes;
-}
+void mux(const unsigned char*, int bytes) { readme::g_muxedBytes += bytes; }
 
 class MyVideoDecoder : public VideoDecoder {
 public:

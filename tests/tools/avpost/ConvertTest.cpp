@@ -34,8 +34,8 @@ std::string Flashes(double seconds)
 }
 std::string Beeps(const std::string& time, double seconds)
 {
-    return "aevalsrc='if(lt(mod(" + time + "\\,2)\\,0.04)\\,0.5*sin(2*PI*1000*t)\\,0)':s=48000:d=" +
-           std::to_string(seconds);
+    return "aevalsrc='if(lt(mod(" + time +
+           "\\,2)\\,0.04)\\,0.5*sin(2*PI*1000*t)\\,0)':s=48000:d=" + std::to_string(seconds);
 }
 
 // A file's pictures (their luma planes, as ffmpeg decodes them, none dropped or repeated)
@@ -119,23 +119,28 @@ protected:
     static std::vector<std::string> Recipe(const std::string& name)
     {
         if (name == "clip.mkv")  // 2 s of 96x64 pictures at 25/s, 48 kHz stereo
-            return {"-f", "lavfi", "-i", "testsrc2=s=96x64:r=25:d=2", "-f", "lavfi", "-i",
-                    "sine=f=440:r=48000:d=2", "-ac", "2", "-c:v", "mpeg4", "-c:a", "pcm_s16le"};
+            return {"-f",   "lavfi",    "-i",   "testsrc2=s=96x64:r=25:d=2",
+                    "-f",   "lavfi",    "-i",   "sine=f=440:r=48000:d=2",
+                    "-ac",  "2",        "-c:v", "mpeg4",
+                    "-c:a", "pcm_s16le"};
         if (name == "pictures.mp4")
             return {"-f", "lavfi", "-i", "testsrc2=s=96x64:r=25:d=1", "-c:v", "mpeg4"};
         if (name == "sound.m4a")
             return {"-f", "lavfi", "-i", "sine=r=44100:d=1", "-c:a", "aac"};
         // Sound that begins 0.5 s after the pictures: its beeps at 2 s and 4 s of the file.
         if (name == "late.mkv")
-            return {"-f", "lavfi", "-i", Flashes(6), "-itsoffset", "0.5", "-f", "lavfi", "-i", Beeps("t+0.5", 5.5),
-                    "-c:v", "ffv1", "-c:a", "pcm_s16le"};
+            return {"-f",   "lavfi", "-i",   Flashes(6), "-itsoffset", "0.5", "-f", "lavfi", "-i", Beeps("t+0.5", 5.5),
+                    "-c:v", "ffv1",  "-c:a", "pcm_s16le"};
         // Sound with half a second missing after 2.5 s; the stamps after it tell.
         if (name == "gap.mkv")
-            return {"-f", "lavfi", "-i", Flashes(6), "-f", "lavfi", "-i",
-                    Beeps("t", 6) + ",aselect='not(between(t\\,2.5\\,3))'", "-c:v", "ffv1", "-c:a", "pcm_s16le"};
+            return {"-f",   "lavfi", "-i",   Flashes(6),
+                    "-f",   "lavfi", "-i",   Beeps("t", 6) + ",aselect='not(between(t\\,2.5\\,3))'",
+                    "-c:v", "ffv1",  "-c:a", "pcm_s16le"};
         // Picture n has luma 16 + 5n; the sound rises by 32767 / 8 a second (a clock in it).
-        return {"-f", "lavfi", "-i", "color=c=black:s=32x32:r=25:d=2,geq=lum='16+5*N':cb=128:cr=128", "-f", "lavfi",
-                "-i", "aevalsrc='t/8':s=48000:d=2", "-c:v", "ffv1", "-pix_fmt", "yuv420p", "-c:a", "pcm_s16le"};
+        return {"-f",   "lavfi",    "-i",       "color=c=black:s=32x32:r=25:d=2,geq=lum='16+5*N':cb=128:cr=128",
+                "-f",   "lavfi",    "-i",       "aevalsrc='t/8':s=48000:d=2",
+                "-c:v", "ffv1",     "-pix_fmt", "yuv420p",
+                "-c:a", "pcm_s16le"};
     }
 
     static RunResult Avpost(std::vector<std::string> arguments, const std::string& stdinFile = "")
@@ -157,8 +162,11 @@ TEST_F(Convert, EachContainerGetsItsCodecsAndTheStreamsTheirSizeCountRateAndLeng
         const char* audio;  // codec_name,sample_rate,channels; empty: no audio stream
         double seconds;
     } cases[] = {
-        {"out.mp4", {"--size", "64x48", "--fps", "30", "--rate", "44100", "--channels", "1", "--crf", "30"},
-         "h264,64,48,30/1,60", "aac,44100,1", 2.0},
+        {"out.mp4",
+         {"--size", "64x48", "--fps", "30", "--rate", "44100", "--channels", "1", "--crf", "30"},
+         "h264,64,48,30/1,60",
+         "aac,44100,1",
+         2.0},
         {"out.mkv", {}, "h264,96,64,25/1,50", "aac,48000,2", 2.0},
         // The stage's last step reaches past the input's last picture, and the sound follows.
         {"out.mov", {"--fps", "12.5"}, "h264,96,64,25/2,26", "aac,48000,2", 2.08},
@@ -235,8 +243,8 @@ TEST_F(Convert, TrimsStartOnTheTickNearestTheStartAndLastTheirDuration)
     };
     for (const auto& c : cases) {
         SCOPED_TRACE(testing::JoinedWords(c.options));
-        std::vector<std::string> arguments{Input("count.nut"), out_.File("trim.mkv"), "-q", "--video-codec", "ffv1",
-                                           "--audio-codec", "pcm_s16le"};
+        std::vector<std::string> arguments{
+            Input("count.nut"), out_.File("trim.mkv"), "-q", "--video-codec", "ffv1", "--audio-codec", "pcm_s16le"};
         arguments.insert(arguments.end(), c.options.begin(), c.options.end());
         const RunResult run = Avpost(arguments);
         ASSERT_EQ(run.exitCode, 0) << run.err;
@@ -246,8 +254,8 @@ TEST_F(Convert, TrimsStartOnTheTickNearestTheStartAndLastTheirDuration)
         // The sound starts on the same tick, to the sample, and lasts as long as the pictures.
         ASSERT_FALSE(decoded.samples.empty());
         EXPECT_NEAR(decoded.samples[0], c.start / 8 * 32767, 1.0);
-        EXPECT_NEAR(static_cast<double>(decoded.samples.size()) / kSampleRate, static_cast<double>(c.pictures) / c.frameRate,
-                    0.5 / kSampleRate);
+        EXPECT_NEAR(static_cast<double>(decoded.samples.size()) / kSampleRate,
+                    static_cast<double>(c.pictures) / c.frameRate, 0.5 / kSampleRate);
     }
 }
 
@@ -321,20 +329,21 @@ TEST_F(Convert, AnInputWithoutPicturesOrSoundConvertsWhatItHas)
 
 TEST_F(Convert, TimedSettingsThumbnailsAndTheSummaryForProgramsComeWithTheOutput)
 {
-    const RunResult run = Avpost({Input("count.nut"), out_.File("out.y4m"), "--brightness", "0,60@0.4-0.8",
-                                  "--thumbnails", "0.5=" + out_.File("thumb%02d.bmp"), "--json",
-                                  out_.File("run.json")});
+    const RunResult run =
+        Avpost({Input("count.nut"), out_.File("out.y4m"), "--brightness", "0,60@0.4-0.8", "--thumbnails",
+                "0.5=" + out_.File("thumb%02d.bmp"), "--json", out_.File("run.json")});
     ASSERT_EQ(run.exitCode, 0) << run.err;
     const Decoded decoded = Decode(out_.File("out.y4m"), 32, 32);
     ASSERT_EQ(decoded.pictures.size(), 50u);
     for (size_t i = 8; i < 22; ++i) {  // pictures 10 to 19 are brighter by 60, clipped at 235
         const int plain = 16 + 5 * static_cast<int>(i);
-        EXPECT_EQ(static_cast<unsigned char>(decoded.pictures[i][0]), i >= 10 && i < 20 ? std::min(plain + 60, 235) : plain)
+        EXPECT_EQ(static_cast<unsigned char>(decoded.pictures[i][0]),
+                  i >= 10 && i < 20 ? std::min(plain + 60, 235) : plain)
             << "picture " << i;
     }
     // Thumbnails at 0, 0.5, 1 and 1.5 s, the one at 0.5 s from the brighter stretch.
-    EXPECT_EQ(out_.List(), (std::vector<std::string>{"out.y4m", "run.json", "thumb01.bmp", "thumb02.bmp",
-                                                     "thumb03.bmp", "thumb04.bmp"}));
+    EXPECT_EQ(out_.List(), (std::vector<std::string>{"out.y4m", "run.json", "thumb01.bmp", "thumb02.bmp", "thumb03.bmp",
+                                                     "thumb04.bmp"}));
     const std::string json = ReadWholeFile(out_.File("run.json"));
     for (const char* field : {"\"container\": \"yuv4mpegpipe\"", "\"pictures_out\": 50", "\"thumbnails\": 4",
                               "\"audio\": null", "\"seconds\": 2,"})
@@ -350,7 +359,7 @@ TEST_F(Convert, AnInterruptedRunLeavesNothingBehind)
     const std::string clip = ReadWholeFile(Input("clip.mkv"));
     testing::FedRun run({AVPOST_TOOL_PATH, "convert", "-", out_.File("out.mp4"), "--preset", "ultrafast",
                          "--thumbnails", "0.1=" + out_.File("t%d.jpg")});
-    run.Feed(clip.substr(0, clip.size() / 2));  // the run waits for the rest
+    run.Feed(clip.substr(0, clip.size() / 2));        // the run waits for the rest
     ASSERT_TRUE(testing::SomethingAppears(out_, 1));  // the output and the first thumbnail, staged
     EXPECT_EQ(run.Interrupt(SIGTERM), 128 + SIGTERM);
     EXPECT_EQ(out_.List(), std::vector<std::string>{});

@@ -65,8 +65,10 @@ std::string TonesHeard(const std::string& path, int tones, uint32_t* mask = null
             double re = 0.0, im = 0.0;  // the tone's part of the channel
             for (size_t k = 0; k < frames; ++k) {
                 const double phase = 2.0 * M_PI * kToneFrequencies[tone] * static_cast<double>(k) / format.sampleRate;
-                re += samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::cos(phase);
-                im += samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::sin(phase);
+                re +=
+                    samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::cos(phase);
+                im +=
+                    samples[k * static_cast<size_t>(format.channels) + static_cast<size_t>(channel)] * std::sin(phase);
             }
             const double amplitude = 2.0 * std::hypot(re, im) / static_cast<double>(frames);
             EXPECT_TRUE(amplitude < 30.0 || amplitude > 500.0) << "tone " << tone << " half heard: " << amplitude;
@@ -189,8 +191,9 @@ TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
     EXPECT_EQ(mask, kFivePointOne);
 #else
     EXPECT_EQ(run.exitCode, 1);
-    EXPECT_EQ(run.err, "avpost: --channels: mixing 7.1 into stereo needs FFmpeg's libswresample, and this avpost "
-                       "was built without FFmpeg\n");
+    EXPECT_EQ(run.err,
+              "avpost: --channels: mixing 7.1 into stereo needs FFmpeg's libswresample, and this avpost "
+              "was built without FFmpeg\n");
 #endif
 }
 
@@ -198,8 +201,8 @@ TEST_F(EverydayMedia, SevenPointOneIsDownmixedThroughFfmpegAndSaysSoOnce)
 TEST_F(EverydayMedia, APhoneClipStoredSidewaysComesOutUprightLikeFfmpegShowsIt)
 {
     // FFmpeg's own upright pictures, turned by its transpose filter.
-    const RunResult reference = testing::RunProgram({"ffmpeg", "-v", "error", "-i", Input("portrait.mp4"), "-f",
-                                                     "yuv4mpegpipe", "-pix_fmt", "yuv420p", "-"});
+    const RunResult reference = testing::RunProgram(
+        {"ffmpeg", "-v", "error", "-i", Input("portrait.mp4"), "-f", "yuv4mpegpipe", "-pix_fmt", "yuv420p", "-"});
     ASSERT_EQ(reference.exitCode, 0) << reference.err;
     const Pictures upright = ReadPictures(reference.out);
     const Pictures turned = VideoOf({}, "portrait.mp4");
@@ -309,8 +312,8 @@ TEST_F(EverydayMedia, TheWatermarkFollowsOneRuleAtEveryPlaceAndUnderACrop)
         // Exactly the mark's 20 x 10 pixels are white; the picture around it is untouched.
         int white = 0;
         for (int y = c.y; y < c.y + 10; ++y)
-            white += static_cast<int>(std::count(luma.begin() + y * width + c.x, luma.begin() + y * width + c.x + 20,
-                                                 '\xEB'));
+            white += static_cast<int>(
+                std::count(luma.begin() + y * width + c.x, luma.begin() + y * width + c.x + 20, '\xEB'));
         EXPECT_EQ(white, 200);
         EXPECT_EQ(luma.compare(0, static_cast<size_t>(c.y * width), plain, 0, static_cast<size_t>(c.y * width)), 0);
     }
@@ -355,7 +358,8 @@ TEST_F(EverydayMedia, AnInterruptedRunLeavesNothingBehindAndSaysWhichSignal)
     const pid_t child = fork();
     if (child == 0) {
         dup2(fds[1], 1);
-        testing::Become({AVPOST_TOOL_PATH, "video", Input("clip.y4m"), "-", "--capture", "9=" + out_.File("late.bmp"), "-q"});
+        testing::Become(
+            {AVPOST_TOOL_PATH, "video", Input("clip.y4m"), "-", "--capture", "9=" + out_.File("late.bmp"), "-q"});
     }
     close(fds[1]);
     int status = 0;

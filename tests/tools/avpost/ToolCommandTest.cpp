@@ -73,7 +73,7 @@ TEST_F(ToolRuns, StreamsThroughStandardInputAndOutputConvertingAndMarkingOnlyWha
     const RunResult video = Avpost({"video", "-", "-", "--watermark", Media("white.bmp")}, Media("clip.y4m"));
     ASSERT_EQ(video.exitCode, 0) << video.err;
     const std::string header = "YUV4MPEG2 W352 H288 F25:1 Ip A1:1 C420jpeg\n";  // as the input says
-    EXPECT_EQ(video.out.substr(0, header.size() + 6), header + "FRAME\n");  // no library traces in the stream
+    EXPECT_EQ(video.out.substr(0, header.size() + 6), header + "FRAME\n");      // no library traces in the stream
     EXPECT_NE(video.err.find("-> standard output"), std::string::npos);
     // The input's pictures, with the white watermark at its own size near the top right corner.
     const std::string clip = ReadWholeFile(Media("clip.y4m"));
@@ -145,10 +145,12 @@ TEST_F(ToolRuns, EachRunEndsWithOneLineAndAnExitCodeKeepingExistingOutputs)
         {{"video", out_.File("missing.mp4"), keep}, 1, out_.File("missing.mp4") + ": No such file or directory"},
         {{"video", out_.File("cut.y4m"), keep}, 1, out_.File("cut.y4m") + ": truncated data in picture 24"},
         {{"video", notes, keep}, 1, notes + ": not a"},
-        {{"audio", Media("tone.wav"), out_.File("x.wav"), "--channels", "6", "--rate", "8000"}, 1,
+        {{"audio", Media("tone.wav"), out_.File("x.wav"), "--channels", "6", "--rate", "8000"},
+         1,
          "--rate: changing the sample rate needs a mono or stereo output"},
         {{"video", Media("clip.y4m"), out_.File("keep.mp4")}, 1, out_.File("keep.mp4") + ": avpost writes Y4M video"},
-        {{"video", Media("clip.y4m"), keep, "--crop", "400:100:0:0"}, 1,
+        {{"video", Media("clip.y4m"), keep, "--crop", "400:100:0:0"},
+         1,
          "--crop: 400:100:0:0 reaches outside the 352x288 input"},
         {{"video", Media("clip.y4m"), keep, "--watermark", notes}, 1, notes + ": not a"},
         {{"video", Media("clip.y4m"), keep, "--fps", "fast"}, 2, "--fps: expected a rate"},

@@ -174,7 +174,8 @@ inline std::string Probe(const std::string& path, const std::string& streamType,
 // A value from ffprobe about a file's container, such as "duration"; empty when it cannot tell.
 inline std::string ProbeFormat(const std::string& path, const std::string& entry)
 {
-    const RunResult run = RunProgram({"ffprobe", "-v", "error", "-show_entries", "format=" + entry, "-of", "csv=p=0", path});
+    const RunResult run =
+        RunProgram({"ffprobe", "-v", "error", "-show_entries", "format=" + entry, "-of", "csv=p=0", path});
     return run.exitCode == 0 ? run.out.substr(0, run.out.find('\n')) : "";
 }
 
@@ -275,8 +276,8 @@ protected:
         Make({"-f", "lavfi", "-i", "testsrc2=size=320x240:rate=25:duration=2", "-f", "lavfi", "-i",
               "sine=frequency=440:sample_rate=44100:duration=2", "-c:v", "mpeg4", "-c:a", "aac", "-ac", "2",
               "-shortest", Media("clip.mp4")});
-        Make({"-f", "lavfi", "-i", "testsrc2=size=720x576:rate=25:duration=1", "-itsoffset", "0.5", "-f", "lavfi",
-              "-i", "sine=sample_rate=48000:duration=1", "-aspect", "16:9", "-c:v", "mpeg4", "-c:a", "pcm_s16le",
+        Make({"-f", "lavfi", "-i", "testsrc2=size=720x576:rate=25:duration=1", "-itsoffset", "0.5", "-f", "lavfi", "-i",
+              "sine=sample_rate=48000:duration=1", "-aspect", "16:9", "-c:v", "mpeg4", "-c:a", "pcm_s16le",
               Media("late-sound.mkv")});
     }
 

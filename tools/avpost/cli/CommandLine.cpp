@@ -30,8 +30,7 @@ void ReadTimedItems(const OptionSpec& spec, const std::string& text, OptionValue
     for (const std::string& item : Split(text, ',')) {
         const size_t at = item.find('@');
         const std::string name = item.substr(0, at);
-        const int number =
-            whole ? WholeNumber(name, spec.low, spec.high, what) : ChoiceValue(spec.choices, name, what);
+        const int number = whole ? WholeNumber(name, spec.low, spec.high, what) : ChoiceValue(spec.choices, name, what);
         if (at != std::string::npos)
             value.stretches.push_back({number, ParseTimeRange(item.substr(at + 1))});
         else
@@ -110,10 +109,7 @@ std::string CommandsOf(const OptionSpec& spec)
     return text;
 }
 
-bool IsOption(const std::string& argument)
-{
-    return argument.size() > 1 && argument[0] == '-';
-}
+bool IsOption(const std::string& argument) { return argument.size() > 1 && argument[0] == '-'; }
 
 Command CommandNamed(const std::string& word)
 {

@@ -81,10 +81,8 @@ avpost convert INPUT OUTPUT [options]
   Needs an avpost built with FFmpeg.
 )";
 
-const std::vector<HelpExample> kDemoExamples = {
-    {"demo /tmp/avpost-demo", "&& ffplay /tmp/avpost-demo/demo.y4m"}};
-const std::vector<HelpExample> kGalleryExamples = {
-    {"gallery /tmp", "&& ffmpeg -i /tmp/gallery.bmp gallery.png"}};
+const std::vector<HelpExample> kDemoExamples = {{"demo /tmp/avpost-demo", "&& ffplay /tmp/avpost-demo/demo.y4m"}};
+const std::vector<HelpExample> kGalleryExamples = {{"gallery /tmp", "&& ffmpeg -i /tmp/gallery.bmp gallery.png"}};
 const std::vector<HelpExample> kVideoExamples = {
     {"video talk.mp4 talk.y4m --size 1280x720 --fps 25", ""},
     {"video tape.mkv - --deinterlace even-average --size 640x480", "| ffmpeg -i - -c:v libx264 tape.mp4"},
@@ -99,10 +97,9 @@ const std::vector<HelpExample> kConvertExamples = {
     {"convert film.mkv trailer.mp4 --start 1:30 --duration 20 --filter sepia@3-4 --crf 20 --preset veryfast", ""},
     {"convert lecture.mp4 lecture.webm --size 640x360 --thumbnails 60=slide%03d.jpg --json run.json", ""},
     {"convert phone.mp4 sound.m4a --no-video --audio-bitrate 96k", ""}};
-const std::vector<HelpExample> kAudioExamples = {
-    {"audio talk.mp4 talk.wav --rate 44100 --channels 2 --continuous", ""},
-    {"audio movie.mkv movie.wav --channels 2", ""},
-    {"audio in.wav - --volume 50", "| ffmpeg -i - quiet.mp3"}};
+const std::vector<HelpExample> kAudioExamples = {{"audio talk.mp4 talk.wav --rate 44100 --channels 2 --continuous", ""},
+                                                 {"audio movie.mkv movie.wav --channels 2", ""},
+                                                 {"audio in.wav - --volume 50", "| ffmpeg -i - quiet.mp3"}};
 
 // Appends words to text, breaking lines at kLineWidth and starting new ones at indent.
 void AppendWrapped(std::string& text, const std::string& words, size_t indent)
@@ -153,10 +150,7 @@ std::string OptionLine(const OptionSpec& spec, const std::string& indent)
     return line + "\n";
 }
 
-bool IsGeneral(const OptionSpec& spec)
-{
-    return spec.commands == (kForDemo | kForVideo | kForAudio | kForConvert);
-}
+bool IsGeneral(const OptionSpec& spec) { return spec.commands == (kForDemo | kForVideo | kForAudio | kForConvert); }
 
 // The options of a command, under their headings; the general ones are listed once, in the
 // overview.
@@ -236,10 +230,7 @@ std::string ShortUsage()
            "       avpost --help   (every option, with examples)\n";
 }
 
-std::string VersionText()
-{
-    return "avpost " AVPOST_VERSION "\n";
-}
+std::string VersionText() { return "avpost " AVPOST_VERSION "\n"; }
 
 const std::vector<HelpExample>& HelpExamples(const std::string& command)
 {

@@ -23,8 +23,9 @@ void SetWatermarkPlace(Invocation& call, const OptionValue& value)
             return;
         }
     }
-    mark.rect = ParsePixelRect(value.text, "top-left, top, top-right, left, center, right, bottom-left, bottom, "
-                                           "bottom-right, or W:H:X:Y in output pixels");
+    mark.rect = ParsePixelRect(value.text,
+                               "top-left, top, top-right, left, center, right, bottom-left, bottom, "
+                               "bottom-right, or W:H:X:Y in output pixels");
     mark.hasRect = true;
 }
 
@@ -248,10 +249,7 @@ std::vector<OptionSpec> MakeTable()
 
 }  // namespace
 
-const std::vector<Choice>& WatermarkPlaces()
-{
-    return kPlaces;
-}
+const std::vector<Choice>& WatermarkPlaces() { return kPlaces; }
 
 const std::vector<OptionSpec>& OptionTable()
 {

@@ -55,7 +55,7 @@ struct Timed {
 struct Capture {
     double seconds = 0.0;  // output time at which the picture is taken
     std::string path;
-    bool jpeg = false;     // by the file name: .jpg or .jpeg, else .bmp
+    bool jpeg = false;  // by the file name: .jpg or .jpeg, else .bmp
 };
 
 // A capture every `every` seconds of output, from its start, named by a pattern with one
@@ -63,7 +63,7 @@ struct Capture {
 struct Thumbnails {
     double every = 0.0;  // 0 = none
     std::string pattern;
-    bool jpeg = false;   // by the pattern's ending, as for Capture
+    bool jpeg = false;  // by the pattern's ending, as for Capture
 };
 
 // The fixed watermark: at one of nine places (align 1 top left ... 9 bottom right, row by
@@ -97,8 +97,8 @@ struct VideoSettings {
     Timed brightness;
     Timed contrast;
     Timed saturation;
-    Timed filters;      // the stage's filter bits, see kFilterGray ...
-    unsigned flips = 0;    // bits: 1 left-right, 2 upside down
+    Timed filters;       // the stage's filter bits, see kFilterGray ...
+    unsigned flips = 0;  // bits: 1 left-right, 2 upside down
     DEINTERLACE_STYLE deinterlace = DEINTERLACE_NONE;
     WatermarkSettings watermark;
     UserWatermarkSettings userWatermark;
@@ -124,14 +124,14 @@ struct EncodeSettings {
     std::string format;      // a container (muxer) name; empty: by the output's name
     std::string videoCodec;  // encoder names; empty: the container's usual codec
     std::string audioCodec;
-    double crf = -1.0;       // below 0: the encoder's default
-    std::string preset;      // empty: the encoder's default
+    double crf = -1.0;         // below 0: the encoder's default
+    std::string preset;        // empty: the encoder's default
     int64_t videoBitRate = 0;  // bits per second; 0: the encoder's default
     int64_t audioBitRate = 0;
-    int threads = 0;         // encoder threads; 0: as many as suit the machine
-    bool video = true;       // --no-video, --no-audio
+    int threads = 0;    // encoder threads; 0: as many as suit the machine
+    bool video = true;  // --no-video, --no-audio
     bool audio = true;
-    std::string json;        // where the summary goes as JSON; empty: nowhere
+    std::string json;  // where the summary goes as JSON; empty: nowhere
 };
 
 struct Invocation {

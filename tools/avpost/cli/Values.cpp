@@ -146,8 +146,9 @@ Capture ParseCapture(const std::string& text)
 
 TimeRange ParseTimeRange(const std::string& text)
 {
-    static const std::string what = "FROM-UNTIL in seconds or h:mm:ss.mmm, such as 3-4.5 or 1:00-1:30 (UNTIL may "
-                                    "be left out)";
+    static const std::string what =
+        "FROM-UNTIL in seconds or h:mm:ss.mmm, such as 3-4.5 or 1:00-1:30 (UNTIL may "
+        "be left out)";
     const size_t dash = text.find('-');
     Expect(dash != std::string::npos, what);
     TimeRange range;
@@ -160,8 +161,9 @@ TimeRange ParseTimeRange(const std::string& text)
 
 Thumbnails ParseThumbnails(const std::string& text)
 {
-    static const std::string what = "SECONDS=PATTERN such as 10=thumb%03d.jpg (one %d for the number; a .bmp, .jpg "
-                                    "or .jpeg name)";
+    static const std::string what =
+        "SECONDS=PATTERN such as 10=thumb%03d.jpg (one %d for the number; a .bmp, .jpg "
+        "or .jpeg name)";
     const Capture every = ParseTimeAndPicture(text, what);
     Expect(every.seconds >= 0.001 && HasOneNumber(every.path), what);
     return {every.seconds, every.path, every.jpeg};

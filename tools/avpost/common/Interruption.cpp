@@ -8,10 +8,7 @@ namespace {
 
 volatile std::sig_atomic_t g_pending = 0;
 
-extern "C" void NoteSignal(int signal)
-{
-    g_pending = signal;
-}
+extern "C" void NoteSignal(int signal) { g_pending = signal; }
 
 }  // namespace
 
@@ -27,10 +24,7 @@ void CatchInterruptions()
     std::signal(SIGPIPE, SIG_IGN);
 }
 
-int PendingInterruption()
-{
-    return g_pending;
-}
+int PendingInterruption() { return g_pending; }
 
 void NoteBrokenPipe()
 {

@@ -6,10 +6,7 @@
 namespace avpost::tool {
 namespace {
 
-bool NearlyWhole(double value)
-{
-    return std::fabs(value - std::round(value)) < 1e-6;
-}
+bool NearlyWhole(double value) { return std::fabs(value - std::round(value)) < 1e-6; }
 
 }  // namespace
 

@@ -9,10 +9,7 @@
 namespace avpost::tool {
 namespace {
 
-bool IsContinuation(unsigned char byte)
-{
-    return (byte & 0xC0) == 0x80;
-}
+bool IsContinuation(unsigned char byte) { return (byte & 0xC0) == 0x80; }
 
 // Length of the sequence a lead byte starts, and the bits it contributes; 0 for a bad lead.
 int SequenceLength(unsigned char lead, char32_t& bits)

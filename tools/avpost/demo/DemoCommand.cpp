@@ -70,9 +70,10 @@ void MakeFolders(const std::string& path)
     for (size_t end = path.find('/', 1);; end = path.find('/', end + 1)) {
         const std::string part = path.substr(0, end);
         struct stat status {};
-        if (mkdir(part.c_str(), 0777) != 0 && !(errno == EEXIST && stat(part.c_str(), &status) == 0 &&
-                                                 S_ISDIR(status.st_mode)))
-            Fail(path, errno == EEXIST ? "exists and is not a folder" : std::string("cannot create: ") + std::strerror(errno));
+        if (mkdir(part.c_str(), 0777) != 0 &&
+            !(errno == EEXIST && stat(part.c_str(), &status) == 0 && S_ISDIR(status.st_mode)))
+            Fail(path, errno == EEXIST ? "exists and is not a folder"
+                                       : std::string("cannot create: ") + std::strerror(errno));
         if (end == std::string::npos)
             return;
     }
@@ -115,9 +116,11 @@ void PrintSummary(std::FILE* out, const std::string& folder, const VideoReport& 
     const std::string f = folder;
     std::fprintf(out, "avpost demo: done in %s s\n\n", FixedText(elapsed, 1).c_str());
     std::fprintf(out, "  video  %s\n", VideoSummary(video).c_str());
-    std::fprintf(out, "         from interlaced 720x576 16:9 pictures at irregular times (about 25/s);\n"
-                      "         deinterlaced, letterboxed, contrast +10, saturation +15, two watermarks,\n"
-                      "         sepia from %.0f s to %.0f s\n", kSepiaFrom, kSepiaUntil);
+    std::fprintf(out,
+                 "         from interlaced 720x576 16:9 pictures at irregular times (about 25/s);\n"
+                 "         deinterlaced, letterboxed, contrast +10, saturation +15, two watermarks,\n"
+                 "         sepia from %.0f s to %.0f s\n",
+                 kSepiaFrom, kSepiaUntil);
     std::fprintf(out, "  audio  %s\n", AudioSummary(audio, true).c_str());
     std::fprintf(out, "         from 48000 Hz stereo blocks with gaps and overlaps; volume 80 %%\n\n");
     std::fprintf(out, "  files  %s/demo.y4m     the pictures (YUV4MPEG2)\n", f.c_str());

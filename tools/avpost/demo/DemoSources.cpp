@@ -15,10 +15,7 @@ void DemoVideoDecoder::OpenFile(const std::string&)
     Show(0);
 }
 
-void DemoVideoDecoder::Close()
-{
-    picture_.reset();
-}
+void DemoVideoDecoder::Close() { picture_.reset(); }
 
 void DemoVideoDecoder::Show(int index)
 {
@@ -94,7 +91,8 @@ double DemoAudioDecoder::Seek(double seconds)
 
 double DemoAudioDecoder::GetOffset() const
 {
-    const int64_t frame = next_ < blocks_.size() ? blocks_[next_].firstFrame : static_cast<int64_t>(kDemoSeconds * kDemoSampleRate);
+    const int64_t frame =
+        next_ < blocks_.size() ? blocks_[next_].firstFrame : static_cast<int64_t>(kDemoSeconds * kDemoSampleRate);
     return static_cast<double>(frame) / kDemoSampleRate;
 }
 

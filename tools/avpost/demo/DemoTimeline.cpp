@@ -56,10 +56,7 @@ int64_t BlockShift(int index)
     return 0;
 }
 
-double Tone(double seconds, double hertz, double level)
-{
-    return level * std::sin(2.0 * kPi * hertz * seconds);
-}
+double Tone(double seconds, double hertz, double level) { return level * std::sin(2.0 * kPi * hertz * seconds); }
 
 }  // namespace
 
@@ -67,7 +64,8 @@ std::vector<int64_t> DemoPictureTimes()
 {
     std::vector<int64_t> times;
     Dice dice;
-    for (int64_t t = 0; t < kEndUnits; t += PictureStep(static_cast<int>(times.size()) - 1, dice) * kUnitsPerMillisecond)
+    for (int64_t t = 0; t < kEndUnits;
+         t += PictureStep(static_cast<int>(times.size()) - 1, dice) * kUnitsPerMillisecond)
         times.push_back(t);
     return times;
 }
@@ -83,10 +81,7 @@ std::vector<DemoBlock> DemoAudioBlocks()
     return blocks;
 }
 
-bool DemoFlashOn(double seconds)
-{
-    return seconds >= 0.0 && seconds - std::floor(seconds) < kFlashSeconds;
-}
+bool DemoFlashOn(double seconds) { return seconds >= 0.0 && seconds - std::floor(seconds) < kFlashSeconds; }
 
 int16_t DemoSample(int64_t frame, int channel)
 {

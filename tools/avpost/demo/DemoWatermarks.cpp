@@ -47,14 +47,8 @@ Bitmap32 Badge(int width, int height, Colour plate, Colour ink, const std::strin
 
 }  // namespace
 
-Bitmap32 DemoLogo()
-{
-    return Badge(200, 56, Colour{70, 35, 20, 150}, Colour{255, 255, 255, 255}, "AVPOST", 5);
-}
+Bitmap32 DemoLogo() { return Badge(200, 56, Colour{70, 35, 20, 150}, Colour{255, 255, 255, 255}, "AVPOST", 5); }
 
-Bitmap32 DemoUserBadge()
-{
-    return Badge(160, 48, Colour{0, 140, 255, 170}, Colour{40, 20, 10, 255}, "USER", 4);
-}
+Bitmap32 DemoUserBadge() { return Badge(160, 48, Colour{0, 140, 255, 170}, Colour{40, 20, 10, 255}, "USER", 4); }
 
 }  // namespace avpost::tool

@@ -25,8 +25,7 @@ void ForEachTextPixel(const std::string& text, int left, int top, int scale, Plo
                 if (GlyphPixel(text[i], gx, gy))
                     for (int sy = 0; sy < scale; ++sy)
                         for (int sx = 0; sx < scale; ++sx)
-                            plot(left + (static_cast<int>(i) * kGlyphAdvance + gx) * scale + sx,
-                                 top + gy * scale + sy);
+                            plot(left + (static_cast<int>(i) * kGlyphAdvance + gx) * scale + sx, top + gy * scale + sy);
 }
 
 // Width in pixels of text drawn at a scale.

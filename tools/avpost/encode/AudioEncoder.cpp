@@ -74,7 +74,8 @@ AudioEncoder::AudioEncoder(const AVCodec& codec, int sampleRate, ChannelLayout l
     : Encoder(codec)
 {
     AVCodecContext& context = this->context();
-    const std::string what = std::to_string(layout.channels) + "-channel sound at " + std::to_string(sampleRate) + " Hz";
+    const std::string what =
+        std::to_string(layout.channels) + "-channel sound at " + std::to_string(sampleRate) + " Hz";
     AVChannelLayout wanted = LayoutOf(layout);
     const bool picked = PickLayout(codec, wanted, context.ch_layout);
     av_channel_layout_uninit(&wanted);
@@ -97,10 +98,7 @@ AudioEncoder::AudioEncoder(const AVCodec& codec, int sampleRate, ChannelLayout l
         Fail(codec.name, "cannot convert 16-bit sound for it");
 }
 
-AudioEncoder::~AudioEncoder()
-{
-    swr_free(&converter_);
-}
+AudioEncoder::~AudioEncoder() { swr_free(&converter_); }
 
 void AudioEncoder::Encode(const unsigned char* samples, size_t bytes, const PacketHandler& handle)
 {

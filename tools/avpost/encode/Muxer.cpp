@@ -20,8 +20,7 @@ struct DictionaryFreer {
 bool HasMovFlags(const AVOutputFormat& container)
 {
     const AVClass* options = container.priv_class;
-    return options != nullptr &&
-           av_opt_find(&options, "movflags", nullptr, 0, AV_OPT_SEARCH_FAKE_OBJ) != nullptr;
+    return options != nullptr && av_opt_find(&options, "movflags", nullptr, 0, AV_OPT_SEARCH_FAKE_OBJ) != nullptr;
 }
 
 }  // namespace
@@ -38,10 +37,7 @@ Muxer::Muxer(const AVOutputFormat& container, OutputTarget& target) : target_(ta
     format_->url = av_strdup(target.readBack().empty() ? "" : ("file:" + target.readBack()).c_str());
 }
 
-Muxer::~Muxer()
-{
-    avformat_free_context(format_);
-}
+Muxer::~Muxer() { avformat_free_context(format_); }
 
 int Muxer::AddStream(const AVCodecContext& encoder)
 {
@@ -67,8 +63,8 @@ void Muxer::Start()
     const std::unique_ptr<AVDictionary, DictionaryFreer> unused(options);
     if (code < 0) {
         const std::string reason = TakeFfmpegMessage();
-        Fail(target_.name(), std::string("the container ") + format_->oformat->name + " refuses the streams: " +
-                                 (reason.empty() ? FfmpegErrorText(code) : reason));
+        Fail(target_.name(), std::string("the container ") + format_->oformat->name +
+                                 " refuses the streams: " + (reason.empty() ? FfmpegErrorText(code) : reason));
     }
 }
 

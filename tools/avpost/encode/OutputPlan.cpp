@@ -35,8 +35,8 @@ const AVOutputFormat* PickContainer(const std::string& output, const EncodeSetti
 bool Holds(const AVOutputFormat& container, AVCodecID codec)
 {
     const int answer = avformat_query_codec(&container, codec, FF_COMPLIANCE_NORMAL);
-    return answer == 1 ||
-           (answer < 0 && std::string(container.name) == "mpegts" && (codec == AV_CODEC_ID_H264 || codec == AV_CODEC_ID_AAC));
+    return answer == 1 || (answer < 0 && std::string(container.name) == "mpegts" &&
+                           (codec == AV_CODEC_ID_H264 || codec == AV_CODEC_ID_AAC));
 }
 
 // PCM sound and raw pictures: what a container chose to be uncompressed stays so.
@@ -48,10 +48,7 @@ bool Uncompressed(AVCodecID codec)
             (descriptor->props & AV_CODEC_PROP_INTRA_ONLY) != 0 && descriptor->type == AVMEDIA_TYPE_AUDIO);
 }
 
-const char* KindName(AVMediaType type)
-{
-    return type == AVMEDIA_TYPE_VIDEO ? "video" : "audio";
-}
+const char* KindName(AVMediaType type) { return type == AVMEDIA_TYPE_VIDEO ? "video" : "audio"; }
 
 const AVCodec* GivenEncoder(const std::string& name, AVMediaType type, const AVOutputFormat& container,
                             const std::string& output)
@@ -99,11 +96,13 @@ OutputPlan PlanOutput(const std::string& output, const EncodeSettings& settings)
     plan.containerHoldsVideo = container.video_codec != AV_CODEC_ID_NONE || !settings.videoCodec.empty();
     plan.containerHoldsAudio = container.audio_codec != AV_CODEC_ID_NONE || !settings.audioCodec.empty();
     if (settings.video && plan.containerHoldsVideo)
-        plan.video = settings.videoCodec.empty() ? UsualEncoder(AVMEDIA_TYPE_VIDEO, container)
-                                                 : GivenEncoder(settings.videoCodec, AVMEDIA_TYPE_VIDEO, container, output);
+        plan.video = settings.videoCodec.empty()
+                         ? UsualEncoder(AVMEDIA_TYPE_VIDEO, container)
+                         : GivenEncoder(settings.videoCodec, AVMEDIA_TYPE_VIDEO, container, output);
     if (settings.audio && plan.containerHoldsAudio)
-        plan.audio = settings.audioCodec.empty() ? UsualEncoder(AVMEDIA_TYPE_AUDIO, container)
-                                                 : GivenEncoder(settings.audioCodec, AVMEDIA_TYPE_AUDIO, container, output);
+        plan.audio = settings.audioCodec.empty()
+                         ? UsualEncoder(AVMEDIA_TYPE_AUDIO, container)
+                         : GivenEncoder(settings.audioCodec, AVMEDIA_TYPE_AUDIO, container, output);
     return plan;
 }
 

@@ -42,15 +42,9 @@ OutputTarget::OutputTarget(const std::string& path)
         Fail(name_, "cannot create: " + FfmpegErrorText(code));
 }
 
-OutputTarget::~OutputTarget()
-{
-    avio_closep(&io_);
-}
+OutputTarget::~OutputTarget() { avio_closep(&io_); }
 
-bool OutputTarget::seekable() const
-{
-    return io_ != nullptr && (io_->seekable & AVIO_SEEKABLE_NORMAL) != 0;
-}
+bool OutputTarget::seekable() const { return io_ != nullptr && (io_->seekable & AVIO_SEEKABLE_NORMAL) != 0; }
 
 void OutputTarget::Close()
 {

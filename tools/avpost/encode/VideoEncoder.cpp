@@ -77,18 +77,15 @@ VideoEncoder::VideoEncoder(const AVCodec& codec, const PictureFormat& format, co
     Open(options, Describe(format));
 }
 
-VideoEncoder::~VideoEncoder()
-{
-    sws_freeContext(converter_);
-}
+VideoEncoder::~VideoEncoder() { sws_freeContext(converter_); }
 
 void VideoEncoder::Encode(FramePtr picture, int64_t index, const PacketHandler& handle)
 {
     const AVCodecContext& context = this->context();
     if (context.pix_fmt != AV_PIX_FMT_YUV420P) {
-        converter_ = sws_getCachedContext(converter_, picture->width, picture->height, AV_PIX_FMT_YUV420P,
-                                          context.width, context.height, context.pix_fmt, SWS_BICUBIC, nullptr,
-                                          nullptr, nullptr);
+        converter_ =
+            sws_getCachedContext(converter_, picture->width, picture->height, AV_PIX_FMT_YUV420P, context.width,
+                                 context.height, context.pix_fmt, SWS_BICUBIC, nullptr, nullptr, nullptr);
         if (converter_ == nullptr)
             Fail(codec().name, "cannot convert the pictures for it");
         FramePtr converted(av_frame_alloc());

@@ -35,8 +35,7 @@ public:
     // Opens the encoder with the settings that concern pictures (quality, preset, bit rate,
     // threads). Throws ToolError when it refuses them; globalHeader: the container keeps the
     // codec's headers apart from the pictures.
-    VideoEncoder(const AVCodec& codec, const PictureFormat& format, const EncodeSettings& settings,
-                 bool globalHeader);
+    VideoEncoder(const AVCodec& codec, const PictureFormat& format, const EncodeSettings& settings, bool globalHeader);
     ~VideoEncoder() override;
 
     // Encodes output picture `index`.

@@ -82,9 +82,6 @@ double FeedAudioSource::Seek(double seconds)
     return held_ ? static_cast<double>(block_.startTime - info_.firstTime) / kUnitsPerSecond : GetOffset();
 }
 
-double FeedAudioSource::GetOffset() const
-{
-    return static_cast<double>(nextTime_ - info_.firstTime) / kUnitsPerSecond;
-}
+double FeedAudioSource::GetOffset() const { return static_cast<double>(nextTime_ - info_.firstTime) / kUnitsPerSecond; }
 
 }  // namespace avpost::tool

@@ -30,8 +30,8 @@ void DescribeAudioStream(const FfmpegInput& input, const FfmpegDecoding& decodin
     const AVCodecParameters& codec = *decoding.stream().codecpar;
     const int channels = codec.ch_layout.nb_channels;
     if (channels < 1 || channels > kMostChannels)
-        Fail(input.name(), "unsupported channel count " + std::to_string(channels) + " (1 to " +
-                               std::to_string(kMostChannels) + ")");
+        Fail(input.name(),
+             "unsupported channel count " + std::to_string(channels) + " (1 to " + std::to_string(kMostChannels) + ")");
     if (codec.sample_rate <= 0)
         Fail(input.name(), "audio stream has no sample rate");
     info = STREAM_INFO{};
@@ -46,10 +46,7 @@ StampClock SampleClock(const FfmpegDecoding& decoding, int sampleRate)
     return StampClock(kUnitsPerSecond / sampleRate, std::min(decoding.TickUnits(), kMostStampWobble));
 }
 
-FfmpegAudioDecoder::~FfmpegAudioDecoder()
-{
-    Close();
-}
+FfmpegAudioDecoder::~FfmpegAudioDecoder() { Close(); }
 
 void FfmpegAudioDecoder::OpenFile(const std::string& path)
 {
@@ -61,10 +58,7 @@ void FfmpegAudioDecoder::OpenFile(const std::string& path)
     converter_ = std::make_unique<SampleConverter>(info_.audio.sampleRate, info_.audio.channels, stream_->name());
 }
 
-double FfmpegAudioDecoder::TotalSeconds() const
-{
-    return stream_ ? stream_->input().DurationSeconds() : 0.0;
-}
+double FfmpegAudioDecoder::TotalSeconds() const { return stream_ ? stream_->input().DurationSeconds() : 0.0; }
 
 void FfmpegAudioDecoder::Close()
 {

@@ -43,7 +43,7 @@ private:
     std::unique_ptr<SampleConverter> converter_;
     std::vector<unsigned char> samples_;
     MEDIA_FRAME block_{};
-    bool held_ = false;     // block_ was decoded by Seek and not handed out yet
+    bool held_ = false;  // block_ was decoded by Seek and not handed out yet
     StampClock clock_{0.0, 0};
     int64_t nextTime_ = 0;  // where the next block starts
 };

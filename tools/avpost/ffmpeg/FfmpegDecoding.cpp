@@ -54,10 +54,7 @@ void FfmpegDecoding::Restart()
     ended_ = false;
 }
 
-int64_t FfmpegDecoding::ToUnits(int64_t timestamp) const
-{
-    return av_rescale_q(timestamp, stream().time_base, kUnits);
-}
+int64_t FfmpegDecoding::ToUnits(int64_t timestamp) const { return av_rescale_q(timestamp, stream().time_base, kUnits); }
 
 int64_t FfmpegDecoding::FrameStamp(const AVFrame& frame) const
 {

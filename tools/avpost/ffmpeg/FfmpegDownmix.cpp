@@ -28,8 +28,8 @@ FfmpegDownmix::FfmpegDownmix(AudioDecoder& source, ChannelLayout from, ChannelLa
     const int rate = source.GetStreamInfo()->audio.sampleRate;
     AVChannelLayout in = FfmpegLayout(from);
     AVChannelLayout out = FfmpegLayout(to);
-    const int code = swr_alloc_set_opts2(&mixer_, &out, AV_SAMPLE_FMT_S16, rate, &in, AV_SAMPLE_FMT_S16, rate, 0,
-                                         nullptr);
+    const int code =
+        swr_alloc_set_opts2(&mixer_, &out, AV_SAMPLE_FMT_S16, rate, &in, AV_SAMPLE_FMT_S16, rate, 0, nullptr);
     av_channel_layout_uninit(&in);
     av_channel_layout_uninit(&out);
     if (code < 0 || swr_init(mixer_) < 0) {
@@ -38,10 +38,7 @@ FfmpegDownmix::FfmpegDownmix(AudioDecoder& source, ChannelLayout from, ChannelLa
     }
 }
 
-FfmpegDownmix::~FfmpegDownmix()
-{
-    swr_free(&mixer_);
-}
+FfmpegDownmix::~FfmpegDownmix() { swr_free(&mixer_); }
 
 // Without a rate change every input frame comes out at once.
 void FfmpegDownmix::Convert(const int16_t* in, int frames, int16_t* out)

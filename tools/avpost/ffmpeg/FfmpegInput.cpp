@@ -22,10 +22,7 @@ bool IsFileError(int code)
     return false;
 }
 
-const char* TypeName(AVMediaType type)
-{
-    return type == AVMEDIA_TYPE_AUDIO ? "audio" : "video";
-}
+const char* TypeName(AVMediaType type) { return type == AVMEDIA_TYPE_AUDIO ? "audio" : "video"; }
 
 }  // namespace
 

@@ -47,10 +47,7 @@ PictureConverter::PictureConverter(int width, int height, const std::string& nam
 {
 }
 
-PictureConverter::~PictureConverter()
-{
-    sws_freeContext(scaler_);
-}
+PictureConverter::~PictureConverter() { sws_freeContext(scaler_); }
 
 FramePtr PictureConverter::Convert(const AVFrame& frame)
 {

@@ -85,10 +85,7 @@ StampClock PictureClock(const FfmpegDecoding& decoding, double frameRate)
     return StampClock(pictureUnits, std::min<int64_t>(decoding.TickUnits(), static_cast<int64_t>(pictureUnits / 4)));
 }
 
-FfmpegVideoDecoder::~FfmpegVideoDecoder()
-{
-    Close();
-}
+FfmpegVideoDecoder::~FfmpegVideoDecoder() { Close(); }
 
 void FfmpegVideoDecoder::OpenFile(const std::string& path)
 {
@@ -101,10 +98,7 @@ void FfmpegVideoDecoder::OpenFile(const std::string& path)
         Fail(path, "video stream holds no pictures");
 }
 
-double FfmpegVideoDecoder::TotalSeconds() const
-{
-    return stream_ ? stream_->input().DurationSeconds() : 0.0;
-}
+double FfmpegVideoDecoder::TotalSeconds() const { return stream_ ? stream_->input().DurationSeconds() : 0.0; }
 
 void FfmpegVideoDecoder::Close()
 {

@@ -40,7 +40,7 @@ private:
 
     std::unique_ptr<FfmpegStream> stream_;
     std::unique_ptr<PictureConverter> converter_;
-    FramePtr frame_;               // the current picture
+    FramePtr frame_;                 // the current picture
     mutable MEDIA_FRAME picture_{};  // the stages' view of it
     StampClock clock_{0.0, 0};
 };

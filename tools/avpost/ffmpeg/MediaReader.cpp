@@ -82,30 +82,15 @@ bool MediaReader::Holds(AVMediaType type) const
     return av_find_best_stream(&input_.format(), type, -1, -1, nullptr, 0) >= 0;
 }
 
-const STREAM_INFO& MediaReader::videoInfo() const
-{
-    return video_->info;
-}
+const STREAM_INFO& MediaReader::videoInfo() const { return video_->info; }
 
-const PictureTraits& MediaReader::pictureTraits() const
-{
-    return video_->traits;
-}
+const PictureTraits& MediaReader::pictureTraits() const { return video_->traits; }
 
-const AVCodecParameters& MediaReader::videoParameters() const
-{
-    return *video_->decoding.stream().codecpar;
-}
+const AVCodecParameters& MediaReader::videoParameters() const { return *video_->decoding.stream().codecpar; }
 
-const STREAM_INFO& MediaReader::audioInfo() const
-{
-    return audio_->info;
-}
+const STREAM_INFO& MediaReader::audioInfo() const { return audio_->info; }
 
-ChannelLayout MediaReader::soundLayout() const
-{
-    return audio_->layout;
-}
+ChannelLayout MediaReader::soundLayout() const { return audio_->layout; }
 
 // An input that cannot jump (a pipe) is read from its beginning; the sources skip what lies
 // before the start.
@@ -173,10 +158,7 @@ void MediaReader::Deliver(DecodedBlock block)
         audio_->done = true;
 }
 
-bool MediaReader::Wanted() const
-{
-    return (video_ && !video_->done) || (audio_ && !audio_->done);
-}
+bool MediaReader::Wanted() const { return (video_ && !video_->done) || (audio_ && !audio_->done); }
 
 void MediaReader::Drain()
 {

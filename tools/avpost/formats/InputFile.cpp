@@ -42,10 +42,7 @@ size_t InputFile::Read(void* buffer, size_t count)
     return got;
 }
 
-long long InputFile::Tell() const
-{
-    return ftello(file_);
-}
+long long InputFile::Tell() const { return ftello(file_); }
 
 void InputFile::SeekTo(long long position)
 {

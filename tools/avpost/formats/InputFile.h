@@ -33,10 +33,7 @@ private:
 };
 
 // True when a path names standard input or output.
-inline bool IsStandardStream(const std::string& path)
-{
-    return path == "-";
-}
+inline bool IsStandardStream(const std::string& path) { return path == "-"; }
 
 }  // namespace avpost::tool
 

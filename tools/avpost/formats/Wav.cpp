@@ -30,7 +30,7 @@ constexpr unsigned char kPcmSubFormat[16] = {0x01, 0x00, 0x00, 0x00, 0x00, 0x00,
                                              0x80, 0x00, 0x00, 0xAA, 0x00, 0x38, 0x9B, 0x71};
 constexpr uint32_t kMonoMask = 0x4;
 constexpr uint32_t kStereoMask = 0x3;
-constexpr int kMostChannels = 32;   // a 16-bit sample frame then fills the stages' 64 bytes
+constexpr int kMostChannels = 32;  // a 16-bit sample frame then fills the stages' 64 bytes
 constexpr int kHighestRate = 768000;
 constexpr long long kRiffSizeOffset = 4;
 
@@ -99,11 +99,10 @@ void WavReader::ReadFormatChunk(uint32_t size)
         tag = ReadLe16(&fmt[24]);  // the first two bytes of the sub-format identifier
     }
     if (tag != kFormatPcm || bits != 16)
-        Fail(input_.name(), "unsupported sample format: " + SampleFormatName(tag, bits) +
-                                " (only 16-bit PCM is read)");
+        Fail(input_.name(), "unsupported sample format: " + SampleFormatName(tag, bits) + " (only 16-bit PCM is read)");
     if (channels < 1 || channels > kMostChannels)
-        Fail(input_.name(), "unsupported channel count " + std::to_string(channels) + " (1 to " +
-                                std::to_string(kMostChannels) + ")");
+        Fail(input_.name(),
+             "unsupported channel count " + std::to_string(channels) + " (1 to " + std::to_string(kMostChannels) + ")");
     if (rate < 1 || rate > static_cast<uint32_t>(kHighestRate))
         Fail(input_.name(), "invalid sample rate " + std::to_string(rate));
     if (blockAlign != channels * 2)
@@ -136,8 +135,8 @@ size_t WavReader::Read(unsigned char* buffer, size_t capacity)
     const size_t got = input_.Read(buffer, wanted);
     dataRead_ += static_cast<long long>(got);
     if (got < wanted && dataBytes_ >= 0)
-        Fail(input_.name(), "truncated sample data (" + std::to_string(dataRead_) + " of " +
-                                std::to_string(dataBytes_) + " bytes)");
+        Fail(input_.name(),
+             "truncated sample data (" + std::to_string(dataRead_) + " of " + std::to_string(dataBytes_) + " bytes)");
     if (got % frameBytes != 0)
         Fail(input_.name(), "truncated sample data (the last sample frame is incomplete)");
     return got;

@@ -45,10 +45,7 @@ bool IsFourTwoZero(const std::string& chroma)
 }
 
 // Plain "420" sits its chroma like "420jpeg".
-std::string ChromaSiting(const std::string& chroma)
-{
-    return chroma == "420" ? "420jpeg" : chroma;
-}
+std::string ChromaSiting(const std::string& chroma) { return chroma == "420" ? "420jpeg" : chroma; }
 
 std::vector<std::string> SplitAtSpaces(const std::string& line)
 {
@@ -88,9 +85,8 @@ void ParseHeader(const std::vector<std::string>& tokens, const std::string& inpu
         else if (tag == 'A' && !ParseFraction(value, format.pixelAspect))
             Fail(input, "Y4M header has an invalid pixel aspect '" + value + "'");
         else if (tag == 'I')
-            format.interlace = value.size() == 1 && std::string("ptbm?").find(value[0]) != std::string::npos
-                                   ? value[0]
-                                   : '?';
+            format.interlace =
+                value.size() == 1 && std::string("ptbm?").find(value[0]) != std::string::npos ? value[0] : '?';
         else if (tag == 'C')
             chroma = value;
     }
@@ -101,17 +97,11 @@ void ParseHeader(const std::vector<std::string>& tokens, const std::string& inpu
     format.chroma = ChromaSiting(chroma);
 }
 
-std::string FractionText(Ratio ratio)
-{
-    return std::to_string(ratio.num) + ":" + std::to_string(ratio.den);
-}
+std::string FractionText(Ratio ratio) { return std::to_string(ratio.num) + ":" + std::to_string(ratio.den); }
 
 }  // namespace
 
-size_t Y4mFormat::LumaBytes() const
-{
-    return static_cast<size_t>(width) * static_cast<size_t>(height);
-}
+size_t Y4mFormat::LumaBytes() const { return static_cast<size_t>(width) * static_cast<size_t>(height); }
 
 size_t Y4mFormat::ChromaBytes() const
 {
@@ -174,10 +164,7 @@ void Y4mReader::ReadPlane(unsigned char* plane, int pitch, int width, int rows, 
             Fail(input_.name(), "truncated data in " + where);
 }
 
-long long Y4mReader::position() const
-{
-    return input_.Tell();
-}
+long long Y4mReader::position() const { return input_.Tell(); }
 
 void Y4mReader::Reposition(long long position, long long picturesRead)
 {
@@ -189,8 +176,7 @@ Y4mWriter::Y4mWriter(OutputFile& output, const Y4mFormat& format) : output_(outp
 {
     const Ratio rate = format.frameRate.known() ? Reduced(format.frameRate) : Ratio{kFallbackRate, 1};
     std::string header = std::string(kMagic) + " W" + std::to_string(format.width) + " H" +
-                         std::to_string(format.height) + " F" + FractionText(rate) + " I" +
-                         format.interlace;
+                         std::to_string(format.height) + " F" + FractionText(rate) + " I" + format.interlace;
     if (format.pixelAspect.known())
         header += " A" + FractionText(Reduced(format.pixelAspect));
     header += " C" + format.chroma + "\n";
@@ -201,8 +187,8 @@ void Y4mWriter::WritePicture(const MEDIA_FRAME& frame)
 {
     if (frame.width != format_.width || frame.height != format_.height)
         Fail(output_.name(), "picture of " + std::to_string(frame.width) + "x" + std::to_string(frame.height) +
-                                 " in a " + std::to_string(format_.width) + "x" +
-                                 std::to_string(format_.height) + " stream");
+                                 " in a " + std::to_string(format_.width) + "x" + std::to_string(format_.height) +
+                                 " stream");
     static const char kFrameLine[] = "FRAME\n";
     output_.Write(kFrameLine, sizeof(kFrameLine) - 1);
     const int chromaWidth = (format_.width + 1) / 2;

@@ -19,8 +19,8 @@ class OutputFile;
 struct Y4mFormat {
     int width = 0;
     int height = 0;
-    Ratio frameRate;    // unknown when the header gives none or F0:0
-    Ratio pixelAspect;  // unknown when the header gives none or A0:0
+    Ratio frameRate;       // unknown when the header gives none or F0:0
+    Ratio pixelAspect;     // unknown when the header gives none or A0:0
     char interlace = '?';  // p progressive, t top field first, b bottom first, m mixed, ? unknown
     // Where chroma samples sit: "420jpeg" (between the luma samples), "420mpeg2" (beside the
     // left one), "420paldv" (on the top-left one).

@@ -42,8 +42,8 @@ void Y4mVideoDecoder::CheckFirstPictureFits() const
         Fail(input_->name(), "Y4M stream holds no pictures");
     if (static_cast<unsigned long long>(left) < needed)
         Fail(input_->name(), "truncated: the header announces " + std::to_string(reader_->format().width) + "x" +
-                                 std::to_string(reader_->format().height) + " pictures of " +
-                                 std::to_string(needed) + " bytes, " + std::to_string(left) + " bytes follow it");
+                                 std::to_string(reader_->format().height) + " pictures of " + std::to_string(needed) +
+                                 " bytes, " + std::to_string(left) + " bytes follow it");
 }
 
 double Y4mVideoDecoder::TotalSeconds() const
@@ -110,9 +110,6 @@ double Y4mVideoDecoder::Seek(double seconds, unsigned)
     return GetOffset();
 }
 
-double Y4mVideoDecoder::GetOffset() const
-{
-    return reader_ ? TimeOf(reader_->picturesRead() - 1) : 0.0;
-}
+double Y4mVideoDecoder::GetOffset() const { return reader_ ? TimeOf(reader_->picturesRead() - 1) : 0.0; }
 
 }  // namespace avpost::tool

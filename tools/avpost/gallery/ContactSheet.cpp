@@ -25,10 +25,7 @@ constexpr unsigned char kBackground = 48;  // dark grey
 constexpr unsigned char kInk = 235;        // white
 constexpr unsigned char kNeutral = 128;
 
-int Rows(int tileCount)
-{
-    return (tileCount + kColumns - 1) / kColumns;
-}
+int Rows(int tileCount) { return (tileCount + kColumns - 1) / kColumns; }
 
 void CopyPlane(const unsigned char* from, int fromPitch, unsigned char* to, int toPitch, int width, int height)
 {
@@ -69,10 +66,7 @@ ContactSheet::ContactSheet(int tileCount, int tileWidth, int tileHeight, const s
     Write(title, kMargin, kMargin, kTitleScale);
 }
 
-int ContactSheet::CellLeft(int index) const
-{
-    return kMargin + (index % kColumns) * (tileWidth_ + kGap);
-}
+int ContactSheet::CellLeft(int index) const { return kMargin + (index % kColumns) * (tileWidth_ + kGap); }
 
 int ContactSheet::CellTop(int index) const
 {

@@ -24,8 +24,7 @@ constexpr int kFullLevel = 100;  // watermarks at their own opacity
 // A source that shows one picture, as a decoder paused on it would.
 class StillSource : public VideoSource {
 public:
-    StillSource(int width, int height, int fieldShift)
-        : picture_(CreateYV12Frame(width, height, false, true))
+    StillSource(int width, int height, int fieldShift) : picture_(CreateYV12Frame(width, height, false, true))
     {
         if (!picture_)
             throw std::bad_alloc();
@@ -82,8 +81,7 @@ GalleryTile Tile(const std::string& name, const std::string& label)
 
 // One tile per choice of an option: "filter-sepia", labelled "FILTER SEPIA".
 template <typename Set>
-void AddChoices(std::vector<GalleryTile>& tiles, const std::vector<Choice>& choices, const std::string& word,
-                Set set)
+void AddChoices(std::vector<GalleryTile>& tiles, const std::vector<Choice>& choices, const std::string& word, Set set)
 {
     for (const Choice& choice : choices) {
         GalleryTile tile = Tile(word + "-" + FileWord(choice.name), Upper(word + " " + choice.name));
@@ -115,10 +113,7 @@ void AddAdjustments(std::vector<GalleryTile>& tiles)
     }
 }
 
-const std::vector<Choice>& ChoicesOf(const char* option)
-{
-    return FindOption(option)->choices;
-}
+const std::vector<Choice>& ChoicesOf(const char* option) { return FindOption(option)->choices; }
 
 }  // namespace
 

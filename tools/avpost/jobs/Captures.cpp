@@ -63,8 +63,8 @@ void CaptureSchedule::Due(double seconds, bool atEnd, const Take& take, std::vec
         captured_[i] = true;
         Shoot(*captureFiles_[i], capture.jpeg, capture.path, take);
         if (early)
-            notes.push_back("--capture " + capture.path + ": the output ends before " +
-                            FixedText(capture.seconds, 3) + " s; its last picture was taken");
+            notes.push_back("--capture " + capture.path + ": the output ends before " + FixedText(capture.seconds, 3) +
+                            " s; its last picture was taken");
     }
     if (thumbnails_.every <= 0.0 || atEnd || seconds + kSlack < nextThumbnail_)
         return;

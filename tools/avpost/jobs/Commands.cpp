@@ -52,8 +52,9 @@ void Report(const Invocation& call, const std::string& description, const std::v
 #ifndef AVPOST_TOOL_HAVE_FFMPEG
 void RunConvertCommand(const Invocation&)
 {
-    Fail("avpost convert", "needs FFmpeg's libraries to encode, and this avpost was built without them; "
-                           "avpost video and avpost audio write Y4M and WAV");
+    Fail("avpost convert",
+         "needs FFmpeg's libraries to encode, and this avpost was built without them; "
+         "avpost video and avpost audio write Y4M and WAV");
 }
 #endif
 

@@ -40,15 +40,9 @@ PictureFormat PictureFormatOf(const VideoJob& job, const AVCodecParameters& inpu
     return format;
 }
 
-bool GlobalHeader(const OutputPlan& plan)
-{
-    return (plan.container->flags & AVFMT_GLOBALHEADER) != 0;
-}
+bool GlobalHeader(const OutputPlan& plan) { return (plan.container->flags & AVFMT_GLOBALHEADER) != 0; }
 
-std::string OutputName(const std::string& path)
-{
-    return IsStandardStream(path) ? "standard output" : path;
-}
+std::string OutputName(const std::string& path) { return IsStandardStream(path) ? "standard output" : path; }
 
 }  // namespace
 
@@ -60,10 +54,12 @@ ConvertJob::ConvertJob(const Invocation& call)
     if (IsStandardStream(call.encode.json) && IsStandardStream(call.output))
         Fail("--json", "- would mix the summary into the media on standard output; name a file");
     plan_ = PlanOutput(call.output, call.encode);
-    reader_ = std::make_unique<MediaReader>(call.input, plan_.video != nullptr, plan_.audio != nullptr, call.trim.start);
+    reader_ =
+        std::make_unique<MediaReader>(call.input, plan_.video != nullptr, plan_.audio != nullptr, call.trim.start);
     if (!reader_->hasVideo() && !reader_->hasAudio())
-        Fail(reader_->name(), plan_.video == nullptr ? "has no audio stream"
-                              : plan_.audio == nullptr ? "has no video stream" : "has neither video nor audio");
+        Fail(reader_->name(), plan_.video == nullptr   ? "has no audio stream"
+                              : plan_.audio == nullptr ? "has no video stream"
+                                                       : "has neither video nor audio");
     const std::string output = OutputName(call.output);
     if (call.encode.video && !plan_.containerHoldsVideo && reader_->Holds(AVMEDIA_TYPE_VIDEO))
         notes_.push_back(output + " (" + plan_.container->name + ") holds no pictures; only the sound is written");
@@ -84,9 +80,9 @@ ConvertJob::~ConvertJob() = default;
 void ConvertJob::PrepareVideo()
 {
     videoSource_ = std::make_unique<FeedVideoSource>(*reader_, reader_->TakeFirstPicture(), pictures_);
-    videoJob_ = std::make_unique<VideoJob>(*videoSource_, reader_->name(), call_.video,
-                                           watermark_ ? &*watermark_ : nullptr,
-                                           userWatermark_ ? &*userWatermark_ : nullptr);
+    videoJob_ =
+        std::make_unique<VideoJob>(*videoSource_, reader_->name(), call_.video, watermark_ ? &*watermark_ : nullptr,
+                                   userWatermark_ ? &*userWatermark_ : nullptr);
     videoEncoder_ = std::make_unique<VideoEncoder>(
         *plan_.video, PictureFormatOf(*videoJob_, reader_->videoParameters()), call_.encode, GlobalHeader(plan_));
     pictureFeed_ = std::make_unique<PictureFeed>(*videoSource_, toVideoEncoder_);
@@ -102,8 +98,8 @@ void ConvertJob::PrepareAudio()
     const int asked = sound.sampleRate != 0 ? sound.sampleRate : reader_->audioInfo().audio.sampleRate;
     const int taken = EncoderSampleRate(*plan_.audio, asked);
     if (taken != asked && call_.audio.sampleRate != 0)
-        Fail("--rate", std::string("the encoder ") + plan_.audio->name + " takes no sound at " +
-                           std::to_string(asked) + " Hz; " + std::to_string(taken) + " Hz would do");
+        Fail("--rate", std::string("the encoder ") + plan_.audio->name + " takes no sound at " + std::to_string(asked) +
+                           " Hz; " + std::to_string(taken) + " Hz would do");
     if (taken != asked) {
         notes_.push_back(std::string("the encoder ") + plan_.audio->name + " takes no sound at " +
                          std::to_string(asked) + " Hz; the audio stage makes it " + std::to_string(taken) + " Hz");
@@ -117,10 +113,7 @@ void ConvertJob::PrepareAudio()
     soundFeed_ = std::make_unique<SoundFeed>(toAudioEncoder_, format.channels * 2);
 }
 
-double ConvertJob::ExpectedSeconds() const
-{
-    return SpanSeconds(reader_->TotalSeconds(), call_.trim);
-}
+double ConvertJob::ExpectedSeconds() const { return SpanSeconds(reader_->TotalSeconds(), call_.trim); }
 
 PacketHandler ConvertJob::ToMuxer(int stream)
 {

@@ -10,8 +10,7 @@
 namespace avpost::tool {
 
 SampleWindow::SampleWindow(const Trim& trim, int sampleRate, int bytesPerFrame, bool align)
-    : start_(trim.start),
-      limit_(std::isfinite(trim.duration) ? std::llround(trim.duration * sampleRate) : INT64_MAX),
+    : start_(trim.start), limit_(std::isfinite(trim.duration) ? std::llround(trim.duration * sampleRate) : INT64_MAX),
       sampleRate_(sampleRate), bytesPerFrame_(bytesPerFrame), placed_(!align)
 {
 }

@@ -14,10 +14,7 @@
 namespace avpost::tool {
 namespace {
 
-std::string SizeText(int width, int height)
-{
-    return std::to_string(width) + "x" + std::to_string(height);
-}
+std::string SizeText(int width, int height) { return std::to_string(width) + "x" + std::to_string(height); }
 
 std::string CropText(const tagRECT& crop)
 {

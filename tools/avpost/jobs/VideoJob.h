@@ -77,7 +77,7 @@ private:
     VideoSource& source_;
     std::string inputName_;
     VideoSettings settings_;
-    int turn_ = 0;                        // clockwise degrees
+    int turn_ = 0;                          // clockwise degrees
     std::unique_ptr<VideoDecoder> turned_;  // between the decoder and the tally, when turning
     std::unique_ptr<VideoTally> tally_;
     VideoStagePtr stage_;

@@ -16,10 +16,7 @@
 namespace avpost::tool {
 namespace {
 
-std::string SystemError()
-{
-    return std::strerror(errno);
-}
+std::string SystemError() { return std::strerror(errno); }
 
 // "dir/name" -> "dir/.name.part-XXXXXX": hidden, and in the target's own folder.
 std::string TemporaryTemplate(const std::string& target)

@@ -13,10 +13,7 @@ std::string Number(double value)
     return text;
 }
 
-std::string Field(const char* name, const std::string& value)
-{
-    return JsonString(name) + ": " + value;
-}
+std::string Field(const char* name, const std::string& value) { return JsonString(name) + ": " + value; }
 
 std::string Object(const std::vector<std::string>& fields, const std::string& indent)
 {
@@ -28,13 +25,13 @@ std::string Object(const std::vector<std::string>& fields, const std::string& in
 
 std::string VideoJson(const VideoReport& video, const std::string& encoder)
 {
-    return Object({Field("encoder", JsonString(encoder)), Field("width", std::to_string(video.width)),
-                   Field("height", std::to_string(video.height)), Field("frame_rate", Number(video.frameRate)),
-                   Field("pictures_in", std::to_string(video.picturesIn)),
-                   Field("pictures_out", std::to_string(video.picturesOut)),
-                   Field("repeated", std::to_string(video.repeated)), Field("dropped", std::to_string(video.dropped)),
-                   Field("thumbnails", std::to_string(video.thumbnails))},
-                  "  ");
+    return Object(
+        {Field("encoder", JsonString(encoder)), Field("width", std::to_string(video.width)),
+         Field("height", std::to_string(video.height)), Field("frame_rate", Number(video.frameRate)),
+         Field("pictures_in", std::to_string(video.picturesIn)),
+         Field("pictures_out", std::to_string(video.picturesOut)), Field("repeated", std::to_string(video.repeated)),
+         Field("dropped", std::to_string(video.dropped)), Field("thumbnails", std::to_string(video.thumbnails))},
+        "  ");
 }
 
 std::string AudioJson(const AudioReport& audio, const std::string& encoder, bool gapsFilled)
@@ -82,8 +79,8 @@ std::string ConvertJson(const ConvertReport& report)
     return Object({Field("input", JsonString(report.input)), Field("output", JsonString(report.output)),
                    Field("container", JsonString(report.container)),
                    Field("video", report.video ? VideoJson(*report.video, report.videoEncoder) : "null"),
-                   Field("audio", report.audio ? AudioJson(*report.audio, report.audioEncoder, report.gapsFilled)
-                                               : "null"),
+                   Field("audio",
+                         report.audio ? AudioJson(*report.audio, report.audioEncoder, report.gapsFilled) : "null"),
                    Field("seconds", Number(report.seconds)), Field("elapsed", Number(report.elapsed)),
                    Field("speed", Number(speed)), Field("notes", noteList)},
                   "") +

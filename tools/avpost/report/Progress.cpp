@@ -33,15 +33,9 @@ Progress::Progress(const char* what, double totalSeconds, bool enabled, std::FIL
 {
 }
 
-Progress::~Progress()
-{
-    Finish();
-}
+Progress::~Progress() { Finish(); }
 
-bool Progress::IsTerminal(std::FILE* stream)
-{
-    return isatty(fileno(stream)) != 0;
-}
+bool Progress::IsTerminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
 
 std::string Progress::Line(double seconds, long long pictures, double elapsed) const
 {
@@ -76,7 +70,8 @@ void Progress::Update(double seconds, long long pictures)
     lastDrawn_ = now;
     const std::string line = Line(seconds, pictures, std::chrono::duration<double>(now - start_).count());
     // Pad with blanks over whatever a longer previous line left.
-    std::fprintf(terminal_, "\r%s%*s", line.c_str(), static_cast<int>(drawnWidth_ > line.size() ? drawnWidth_ - line.size() : 0), "");
+    std::fprintf(terminal_, "\r%s%*s", line.c_str(),
+                 static_cast<int>(drawnWidth_ > line.size() ? drawnWidth_ - line.size() : 0), "");
     std::fflush(terminal_);
     drawnWidth_ = line.size();
 }

@@ -15,8 +15,8 @@ std::string VideoSummary(const VideoReport& report)
 {
     // Rates such as 29.97 keep their decimals; 25 and 30 need none.
     const int decimals = report.frameRate == static_cast<long long>(report.frameRate) ? 0 : 2;
-    return std::to_string(report.picturesIn) + " pictures in, " + std::to_string(report.picturesOut) +
-           " out at " + FixedText(report.frameRate, decimals) + "/s as " + std::to_string(report.width) + "x" +
+    return std::to_string(report.picturesIn) + " pictures in, " + std::to_string(report.picturesOut) + " out at " +
+           FixedText(report.frameRate, decimals) + "/s as " + std::to_string(report.width) + "x" +
            std::to_string(report.height) + " (" + std::to_string(report.repeated) + " repeated, " +
            std::to_string(report.dropped) + " dropped)";
 }

@@ -22,7 +22,7 @@ std::string FixedText(double value, int decimals);
 
 // What avpost convert did.
 struct ConvertReport {
-    std::string input;   // as messages name it
+    std::string input;  // as messages name it
     std::string output;
     std::string container;
     std::optional<VideoReport> video;
@@ -30,8 +30,8 @@ struct ConvertReport {
     std::optional<AudioReport> audio;
     std::string audioEncoder;
     bool gapsFilled = true;  // the audio stage was continuous
-    double seconds = 0.0;  // length of the output
-    double elapsed = 0.0;  // wall-clock seconds the run took
+    double seconds = 0.0;    // length of the output
+    double elapsed = 0.0;    // wall-clock seconds the run took
     std::vector<std::string> notes;
 };
 

@@ -4,10 +4,7 @@ namespace avpost::tool {
 namespace {
 
 // Index in stored order of the channel feeding speaker, when the mask has it.
-int IndexOf(uint32_t mask, uint32_t speaker)
-{
-    return __builtin_popcount(mask & (speaker - 1));
-}
+int IndexOf(uint32_t mask, uint32_t speaker) { return __builtin_popcount(mask & (speaker - 1)); }
 
 }  // namespace
 
@@ -27,10 +24,7 @@ ChannelLayout UsualLayout(int channels)
     }
 }
 
-ChannelLayout Resolved(ChannelLayout layout)
-{
-    return layout.mask != 0 ? layout : UsualLayout(layout.channels);
-}
+ChannelLayout Resolved(ChannelLayout layout) { return layout.mask != 0 ? layout : UsualLayout(layout.channels); }
 
 std::string LayoutName(ChannelLayout layout)
 {
@@ -57,9 +51,12 @@ bool IsFivePointOne(ChannelLayout layout)
 std::vector<int> StageOrderOfFivePointOne(ChannelLayout layout)
 {
     const bool side = layout.mask == kFivePointOneSide;
-    return {IndexOf(layout.mask, kFrontLeft),   IndexOf(layout.mask, kFrontRight),
-            IndexOf(layout.mask, side ? kSideLeft : kBackLeft), IndexOf(layout.mask, side ? kSideRight : kBackRight),
-            IndexOf(layout.mask, kFrontCenter), IndexOf(layout.mask, kLowFrequency)};
+    return {IndexOf(layout.mask, kFrontLeft),
+            IndexOf(layout.mask, kFrontRight),
+            IndexOf(layout.mask, side ? kSideLeft : kBackLeft),
+            IndexOf(layout.mask, side ? kSideRight : kBackRight),
+            IndexOf(layout.mask, kFrontCenter),
+            IndexOf(layout.mask, kLowFrequency)};
 }
 
 }  // namespace avpost::tool

@@ -33,10 +33,7 @@ std::string Head(const std::string& path, size_t count)
     return head;
 }
 
-bool LooksLikeY4m(const std::string& path)
-{
-    return Head(path, 9) == "YUV4MPEG2";
-}
+bool LooksLikeY4m(const std::string& path) { return Head(path, 9) == "YUV4MPEG2"; }
 
 bool LooksLikeWav(const std::string& path)
 {
@@ -96,10 +93,7 @@ std::unique_ptr<AudioSource> OpenAudioInput(const std::string& path)
     return OpenInput<AudioSource, WavAudioDecoder, FfmpegAudio>(path, wav, "WAV");
 }
 
-std::string InputName(const std::string& path)
-{
-    return IsStandardStream(path) ? "standard input" : path;
-}
+std::string InputName(const std::string& path) { return IsStandardStream(path) ? "standard input" : path; }
 
 Bitmap32 LoadWatermarkImage(const std::string& path)
 {

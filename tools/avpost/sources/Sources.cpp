@@ -10,15 +10,9 @@
 
 namespace avpost::tool {
 
-void VideoStageReleaser::operator()(VideoDecoder* stage) const
-{
-    PCVideoRelease(stage);
-}
+void VideoStageReleaser::operator()(VideoDecoder* stage) const { PCVideoRelease(stage); }
 
-void AudioStageReleaser::operator()(AudioDecoder* stage) const
-{
-    PCAudioRelease(stage);
-}
+void AudioStageReleaser::operator()(AudioDecoder* stage) const { PCAudioRelease(stage); }
 
 int SourceStatus::OpenWide(const wchar_t* path, int* result)
 {
@@ -72,8 +66,7 @@ void FillAudioInfo(STREAM_INFO& info, int sampleRate, int channels)
     info.audio.bytesPerSecond = sampleRate * channels * 2;
 }
 
-void DescribeAudioBlock(MEDIA_FRAME& block, const STREAM_INFO& info, unsigned char* data, int bytes,
-                        int64_t startTime)
+void DescribeAudioBlock(MEDIA_FRAME& block, const STREAM_INFO& info, unsigned char* data, int bytes, int64_t startTime)
 {
     block = MEDIA_FRAME{};
     block.type = 3;
@@ -88,9 +81,6 @@ void DescribeAudioBlock(MEDIA_FRAME& block, const STREAM_INFO& info, unsigned ch
     block.duration = static_cast<int32_t>(std::llround(bytes * kUnitsPerSecond / info.audio.bytesPerSecond));
 }
 
-int64_t ToUnits(double seconds)
-{
-    return std::llround(seconds * kUnitsPerSecond);
-}
+int64_t ToUnits(double seconds) { return std::llround(seconds * kUnitsPerSecond); }
 
 }  // namespace avpost::tool

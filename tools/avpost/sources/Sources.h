@@ -94,8 +94,7 @@ void FillVideoInfo(STREAM_INFO& info, int width, int height, double frameRate, R
 void FillAudioInfo(STREAM_INFO& info, int sampleRate, int channels);
 
 // An audio block record over a caller's buffer, with times in 100 ns units.
-void DescribeAudioBlock(MEDIA_FRAME& block, const STREAM_INFO& info, unsigned char* data, int bytes,
-                        int64_t startTime);
+void DescribeAudioBlock(MEDIA_FRAME& block, const STREAM_INFO& info, unsigned char* data, int bytes, int64_t startTime);
 
 // Seconds to 100 ns units, rounded to the nearest unit.
 int64_t ToUnits(double seconds);

@@ -15,20 +15,54 @@
 namespace avpost::tool {
 namespace {
 
-Invocation Parse(std::vector<std::string> args)
-{
-    return ParseCommandLine(args);
-}
+Invocation Parse(std::vector<std::string> args) { return ParseCommandLine(args); }
 
 TEST(CommandLine, VideoOptionsReachTheirSettings)
 {
-    const Invocation call =
-        Parse({"video", "in.mp4", "--size", "640x480", "--fit=fill", "--interp", "nearest", "--fps", "30000/1001",
-               "--keep-last", "--crop", "640:360:8:4", "--brightness", "-20", "--contrast", "15", "--saturation",
-               "100", "--filter", "sepia,gray", "--hflip", "--vflip", "--deinterlace", "odd-average", "--watermark",
-               "logo.bmp", "--watermark-pos", "bottom-right", "--watermark-level", "0", "--user-watermark",
-               "u.png", "--user-watermark-pos", "0.5:0.25:0.5:0", "--user-watermark-level", "60", "--capture",
-               "1:02.5=a.JPG", "--capture", "0=b.bmp", "--rotate", "270", "out.y4m", "-q"});
+    const Invocation call = Parse({"video",
+                                   "in.mp4",
+                                   "--size",
+                                   "640x480",
+                                   "--fit=fill",
+                                   "--interp",
+                                   "nearest",
+                                   "--fps",
+                                   "30000/1001",
+                                   "--keep-last",
+                                   "--crop",
+                                   "640:360:8:4",
+                                   "--brightness",
+                                   "-20",
+                                   "--contrast",
+                                   "15",
+                                   "--saturation",
+                                   "100",
+                                   "--filter",
+                                   "sepia,gray",
+                                   "--hflip",
+                                   "--vflip",
+                                   "--deinterlace",
+                                   "odd-average",
+                                   "--watermark",
+                                   "logo.bmp",
+                                   "--watermark-pos",
+                                   "bottom-right",
+                                   "--watermark-level",
+                                   "0",
+                                   "--user-watermark",
+                                   "u.png",
+                                   "--user-watermark-pos",
+                                   "0.5:0.25:0.5:0",
+                                   "--user-watermark-level",
+                                   "60",
+                                   "--capture",
+                                   "1:02.5=a.JPG",
+                                   "--capture",
+                                   "0=b.bmp",
+                                   "--rotate",
+                                   "270",
+                                   "out.y4m",
+                                   "-q"});
     EXPECT_EQ(std::tie(call.command, call.input, call.output, call.quiet),
               std::make_tuple(Command::Video, "in.mp4", "out.y4m", true));
     const VideoSettings& v = call.video;
@@ -75,16 +109,45 @@ TEST(CommandLine, AudioOptionsDefaultsAndPlainWords)
 
 TEST(CommandLine, ConvertTakesEncodingTrimmingAndTimedSettings)
 {
-    const Invocation call = Parse({"convert", "talk.mov", "talk.mp4", "--size", "1280x720", "--volume", "80", "-f",
-                                   "matroska", "-c:v", "libx265", "--audio-codec", "libopus", "--crf", "18.5",
-                                   "--preset", "veryfast", "-b:v", "2.5M", "--audio-bitrate", "96k", "--threads", "3",
-                                   "-an", "--start", "1:30", "--duration", "20.5", "--json", "run.json", "--gaps",
-                                   "close", "--thumbnails", "2.5=shots/t%03d-%%.jpg"});
+    const Invocation call = Parse({"convert",
+                                   "talk.mov",
+                                   "talk.mp4",
+                                   "--size",
+                                   "1280x720",
+                                   "--volume",
+                                   "80",
+                                   "-f",
+                                   "matroska",
+                                   "-c:v",
+                                   "libx265",
+                                   "--audio-codec",
+                                   "libopus",
+                                   "--crf",
+                                   "18.5",
+                                   "--preset",
+                                   "veryfast",
+                                   "-b:v",
+                                   "2.5M",
+                                   "--audio-bitrate",
+                                   "96k",
+                                   "--threads",
+                                   "3",
+                                   "-an",
+                                   "--start",
+                                   "1:30",
+                                   "--duration",
+                                   "20.5",
+                                   "--json",
+                                   "run.json",
+                                   "--gaps",
+                                   "close",
+                                   "--thumbnails",
+                                   "2.5=shots/t%03d-%%.jpg"});
     EXPECT_EQ(std::tie(call.command, call.video.width, call.audio.volume, call.audio.continuous),
               std::make_tuple(Command::Convert, 1280, 80, false));
     const EncodeSettings& e = call.encode;
-    EXPECT_EQ(std::tie(e.format, e.videoCodec, e.audioCodec, e.crf, e.preset, e.videoBitRate, e.audioBitRate,
-                       e.threads, e.video, e.audio, e.json),
+    EXPECT_EQ(std::tie(e.format, e.videoCodec, e.audioCodec, e.crf, e.preset, e.videoBitRate, e.audioBitRate, e.threads,
+                       e.video, e.audio, e.json),
               std::make_tuple("matroska", "libx265", "libopus", 18.5, "veryfast", int64_t{2500000}, int64_t{96000}, 3,
                               true, false, "run.json"));
     EXPECT_EQ(std::tie(call.trim.start, call.trim.duration), std::make_tuple(90.0, 20.5));
@@ -131,7 +194,8 @@ TEST(CommandLine, BadInputIsNamedWithWhatWasExpected)
         {{"encode"}, "encode: unknown command"},
         {{"convert", "a"}, "avpost convert: needs an OUTPUT after the INPUT"},
         {{"video", "a", "b", "--crf", "20"}, "--crf: is an option of 'avpost convert'"},
-        {{"audio", "a", "b", "--thumbnails", "5=t%d.jpg"}, "--thumbnails: is an option of 'avpost video' and 'avpost convert'"},
+        {{"audio", "a", "b", "--thumbnails", "5=t%d.jpg"},
+         "--thumbnails: is an option of 'avpost video' and 'avpost convert'"},
         {{"convert", "a", "b", "--continuous"}, "--continuous: is an option of 'avpost audio'"},
         {{"convert", "a", "b", "--brightness", "10@4-3"}, "--brightness: expected FROM-UNTIL"},
         {{"convert", "a", "b", "--brightness", "101@1-2"}, "--brightness: expected a whole number from -100 to 100"},
@@ -159,7 +223,8 @@ TEST(CommandLine, BadInputIsNamedWithWhatWasExpected)
         {{"demo", "--continuous"}, "--continuous: is an option of 'avpost audio'"},
         {{"video", "a", "b", "--size"}, "--size: needs a value"},
         {{"video", "a", "b", "--hflip=yes"}, "--hflip: takes no value"},
-        {{"video", "a", "b", "--size", "640"}, "--size: expected WIDTHxHEIGHT such as 1280x720 (2 to 16384 each), got '640'"},
+        {{"video", "a", "b", "--size", "640"},
+         "--size: expected WIDTHxHEIGHT such as 1280x720 (2 to 16384 each), got '640'"},
         {{"video", "a", "b", "--size", "1x480"}, "--size: expected WIDTHxHEIGHT"},
         {{"video", "a", "b", "--size", "640x480x2"}, "--size: expected WIDTHxHEIGHT"},
         {{"video", "a", "b", "--fit", "zoom"}, "--fit: expected keep, stretch, fill, 16:9 or 4:3, got 'zoom'"},
@@ -198,8 +263,9 @@ TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
 {
     const std::string help = HelpText("");
     for (const OptionSpec& spec : OptionTable()) {
-        const std::string topic =
-            (spec.commands & kForVideo) != 0 ? "video" : (spec.commands & kForAudio) != 0 ? "audio" : "convert";
+        const std::string topic = (spec.commands & kForVideo) != 0   ? "video"
+                                  : (spec.commands & kForAudio) != 0 ? "audio"
+                                                                     : "convert";
         const std::string part = (spec.commands & kForDemo) != 0 ? help : HelpText(topic);
         EXPECT_NE(part.find(std::string(spec.name) + " "), std::string::npos) << spec.name;
         if (spec.defaultValue != nullptr) {

@@ -15,8 +15,9 @@ TEST(Ratios, FrameRatesAndAspectsBecomeTheFractionsFilesUse)
     const struct {
         double rate;
         int64_t num, den;
-    } cases[] = {{25.0, 25, 1},           {30000.0 / 1001, 30000, 1001}, {24000.0 / 1001, 24000, 1001},
-                 {12.5, 25, 2},           {0.0, 0, 0},                   {-3.0, 0, 0}};
+    } cases[] = {
+        {25.0, 25, 1}, {30000.0 / 1001, 30000, 1001}, {24000.0 / 1001, 24000, 1001}, {12.5, 25, 2}, {0.0, 0, 0},
+        {-3.0, 0, 0}};
     for (const auto& c : cases)
         EXPECT_EQ(std::tuple(RateFraction(c.rate).num, RateFraction(c.rate).den), std::tie(c.num, c.den)) << c.rate;
 

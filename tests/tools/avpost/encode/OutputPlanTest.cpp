@@ -10,10 +10,7 @@
 namespace avpost::tool {
 namespace {
 
-std::string Named(const AVCodec* codec)
-{
-    return codec != nullptr ? codec->name : "-";
-}
+std::string Named(const AVCodec* codec) { return codec != nullptr ? codec->name : "-"; }
 
 TEST(OutputPlans, H264AndAacWhereTheContainerHoldsThemElseItsOwnChoice)
 {

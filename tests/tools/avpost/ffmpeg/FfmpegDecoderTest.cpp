@@ -118,7 +118,8 @@ TEST_F(FfmpegFiles, PicturesSayHowTheirFieldsAndChromaLieAndSoundItsSpeakers)
         const char* header;
         char interlace;
         const char* chroma;
-    } layouts[] = {{"It C420mpeg2", 't', "420mpeg2"}, {"Ib C420paldv", 'b', "420paldv"}, {"Ip C420jpeg", 'p', "420jpeg"}};
+    } layouts[] = {
+        {"It C420mpeg2", 't', "420mpeg2"}, {"Ib C420paldv", 'b', "420paldv"}, {"Ip C420jpeg", 'p', "420jpeg"}};
     for (const auto& c : layouts) {
         testing::WriteWholeFile(Media("fields.y4m"), std::string("YUV4MPEG2 W4 H2 F25:1 ") + c.header + "\nFRAME\n" +
                                                          std::string(12, '\x80'));

@@ -36,7 +36,7 @@ TEST(BmpReading, RowsBecomeTopDownBlueGreenRedAlpha)
         // Bottom row blue, top row red; each 3-byte row padded to 4.
         {1, 2, 24, std::string("\xFF\0\0\0\0\0\xFF\0", 8), std::string("\0\0\xFF\xFF\xFF\0\0\xFF", 8)},
         {2, -1, 32, std::string("\1\2\3\x40\4\5\6\0", 8), std::string("\1\2\3\x40\4\5\6\0", 8)},  // top-down
-        {2, 1, 32, std::string("\1\2\3\0\4\5\6\0", 8), std::string("\1\2\3\xFF\4\5\6\xFF", 8)},  // no alpha: opaque
+        {2, 1, 32, std::string("\1\2\3\0\4\5\6\0", 8), std::string("\1\2\3\xFF\4\5\6\xFF", 8)},   // no alpha: opaque
     };
     for (const auto& c : cases) {
         const Bitmap32 bitmap = Read(BmpBytes(c.width, c.height, c.bits, c.rows));

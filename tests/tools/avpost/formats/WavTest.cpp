@@ -27,24 +27,25 @@ struct WavLayout {
     uint16_t channels = 2;
     uint32_t rate = 48000;
     uint16_t bits = 16;
-    int blockAlign = -1;            // -1: channels x bits / 8
-    std::string beforeData;         // whole chunks between "fmt " and "data"
-    uint32_t statedDataSize = 0;    // 0: the real size
+    int blockAlign = -1;          // -1: channels x bits / 8
+    std::string beforeData;       // whole chunks between "fmt " and "data"
+    uint32_t statedDataSize = 0;  // 0: the real size
     std::string samples = std::string(16, '\x01');
-    uint16_t subFormat = 0;         // non-zero: the extensible form with this sub-format
-    uint32_t mask = 3;              // its channel mask
+    uint16_t subFormat = 0;  // non-zero: the extensible form with this sub-format
+    uint32_t mask = 3;       // its channel mask
 };
 
 std::string WavBytes(const WavLayout& layout)
 {
     const uint16_t align = layout.blockAlign >= 0 ? static_cast<uint16_t>(layout.blockAlign)
-                                                : static_cast<uint16_t>(layout.channels * layout.bits / 8);
+                                                  : static_cast<uint16_t>(layout.channels * layout.bits / 8);
     std::string fmt = Le16(layout.subFormat ? 0xFFFE : layout.tag) + Le16(layout.channels) + Le32(layout.rate) +
                       Le32(layout.rate * align) + Le16(align) + Le16(layout.bits);
     if (layout.subFormat)
         fmt += Le16(22) + Le16(layout.bits) + Le32(layout.mask) + Le16(layout.subFormat) +
                std::string("\x00\x00\x00\x00\x10\x00\x80\x00\x00\xAA\x00\x38\x9B\x71", 14);
-    const uint32_t dataSize = layout.statedDataSize ? layout.statedDataSize : static_cast<uint32_t>(layout.samples.size());
+    const uint32_t dataSize =
+        layout.statedDataSize ? layout.statedDataSize : static_cast<uint32_t>(layout.samples.size());
     const std::string body = "WAVEfmt " + Le32(static_cast<uint32_t>(fmt.size())) + fmt + layout.beforeData + "data" +
                              Le32(dataSize) + layout.samples;
     return "RIFF" + Le32(static_cast<uint32_t>(body.size())) + body;
@@ -99,11 +100,10 @@ TEST(WavAudioSource, SaysWhichSpeakersTheChannelsFeed)
         uint32_t mask;
         uint32_t layout;
     } cases[] = {
-        {6, 0, 0, 0x3F},       // a plain 6-channel file is taken as 5.1
-        {6, 1, 0x60F, 0x60F},  // 5.1 with side speakers
-        {2, 1, 0x600, 0x600},
-        {3, 1, 0x3, 0},        // a mask of two speakers for three channels says nothing
-        {8, 0, 0, 0x63F},      // 7.1
+        {6, 0, 0, 0x3F},                       // a plain 6-channel file is taken as 5.1
+        {6, 1, 0x60F, 0x60F},                  // 5.1 with side speakers
+        {2, 1, 0x600, 0x600}, {3, 1, 0x3, 0},  // a mask of two speakers for three channels says nothing
+        {8, 0, 0, 0x63F},                      // 7.1
         {4, 0, 0, 0},
     };
     for (const auto& c : cases) {
@@ -115,7 +115,8 @@ TEST(WavAudioSource, SaysWhichSpeakersTheChannelsFeed)
         WriteWholeFile(dir.File("a.wav"), WavBytes(layout));
         WavAudioDecoder source;
         source.OpenFile(dir.File("a.wav"));
-        EXPECT_EQ(std::make_tuple(source.layout().channels, source.layout().mask), std::make_tuple(c.channels, c.layout))
+        EXPECT_EQ(std::make_tuple(source.layout().channels, source.layout().mask),
+                  std::make_tuple(c.channels, c.layout))
             << c.mask;
     }
 }
@@ -137,8 +138,16 @@ TEST(WavFormat, ReadsSixteenBitPcmInAnyLayoutAndRefusesTheRestWithAReason)
         {with([](WavLayout& s) { s.statedDataSize = 0xFFFFFFFF; }), ""},  // a stream: read to its end
         {with([](WavLayout& s) { s.bits = 8; }), "unsupported sample format: 8-bit PCM (only 16-bit PCM is read)"},
         {with([](WavLayout& s) { s.bits = 24; }), "24-bit PCM"},
-        {with([](WavLayout& s) { s.tag = 3; s.bits = 32; }), "32-bit floating point"},
-        {with([](WavLayout& s) { s.subFormat = 3; s.bits = 32; }), "32-bit floating point"},
+        {with([](WavLayout& s) {
+             s.tag = 3;
+             s.bits = 32;
+         }),
+         "32-bit floating point"},
+        {with([](WavLayout& s) {
+             s.subFormat = 3;
+             s.bits = 32;
+         }),
+         "32-bit floating point"},
         {with([](WavLayout& s) { s.tag = 0x55; }), "compressed audio (format tag 85)"},
         {with([](WavLayout& s) { s.channels = 0; }), "unsupported channel count 0"},
         {with([](WavLayout& s) { s.rate = 0; }), "invalid sample rate 0"},

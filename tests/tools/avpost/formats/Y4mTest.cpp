@@ -150,7 +150,7 @@ TEST(Y4mVideoSource, StampsPicturesShowsTheDisplayAspectSeeksAndReportsDamage)
     const MEDIA_FRAME* fourth = source.GetFrame();
     EXPECT_EQ(std::make_tuple(fourth->plane[0][0], fourth->startTime, fourth->duration),
               std::make_tuple(4, 1001000, 333667));  // 3 x 1001 / 30000 s, 1001 / 30000 s
-    EXPECT_EQ(source.Forward(5), 1);  // only one left
+    EXPECT_EQ(source.Forward(5), 1);                 // only one left
     EXPECT_EQ(source.Forward(1), 0);
     EXPECT_EQ(source.GetFrame()->plane[0][0], 5);  // the last picture stays
     EXPECT_NEAR(source.TotalSeconds(), 5 * 1001 / 30000.0, 1e-3);

@@ -17,8 +17,8 @@ TEST(Captures, ThumbnailNamesFillInTheNumberAsPrintfWould)
         int number;
         const char* name;
     } cases[] = {
-        {"t%d.jpg", 7, "t7.jpg"},       {"t%03d.jpg", 7, "t007.jpg"},   {"t%03d.jpg", 1234, "t1234.jpg"},
-        {"%%%2d.bmp", 3, "% 3.bmp"},    {"a%%b%d%%.jpeg", 12, "a%b12%.jpeg"},
+        {"t%d.jpg", 7, "t7.jpg"},    {"t%03d.jpg", 7, "t007.jpg"},         {"t%03d.jpg", 1234, "t1234.jpg"},
+        {"%%%2d.bmp", 3, "% 3.bmp"}, {"a%%b%d%%.jpeg", 12, "a%b12%.jpeg"},
     };
     for (const auto& c : cases)
         EXPECT_EQ(ThumbnailName(c.pattern, c.number), c.name) << c.pattern;

@@ -27,7 +27,7 @@ public:
 
 struct Block {
     int64_t startMs;
-    int first;   // value of its first sample; the others count up from it
+    int first;  // value of its first sample; the others count up from it
     int frames;
 };
 
@@ -48,8 +48,12 @@ TEST(SampleWindows, CutTheSoundToTheTrimFromWhereTheFirstBlockLies)
         {"the sound begins after the start", {1.0, kOpen}, true, {{1003, 1, 2}}, {0, 0, 0, 1, 2}, 1},
         {"the duration ends inside a block", {1.0, 0.004}, true, {{1000, 1, 3}, {1003, 4, 3}}, {1, 2, 3, 4}, 2},
         {"silence fills even a short window", {1.0, 0.002}, true, {{1005, 1, 3}}, {0, 0}, 1},
-        {"later blocks follow whatever their stamps", {0.0, 0.006}, false, {{0, 1, 2}, {50, 3, 2}, {20, 5, 9}},
-         {1, 2, 3, 4, 5, 6}, 3},
+        {"later blocks follow whatever their stamps",
+         {0.0, 0.006},
+         false,
+         {{0, 1, 2}, {50, 3, 2}, {20, 5, 9}},
+         {1, 2, 3, 4, 5, 6},
+         3},
     };
     for (const auto& c : cases) {
         SampleWindow window(c.trim, kRate, 2, c.align);

@@ -36,7 +36,8 @@ TEST(ProgressLine, SaysWhereHowFastAndHowLongIsLeftWhenEnabledAndClearsItselfAwa
     }
     terminal.reset();
     const std::string text = testing::ReadWholeFile(dir.File("terminal"));
-    ASSERT_EQ(text.rfind("\rvideo  1.0 s of 10.0 s (10 %)  25 pictures", 0), 0u) << text;  // nothing from the silent one
+    ASSERT_EQ(text.rfind("\rvideo  1.0 s of 10.0 s (10 %)  25 pictures", 0), 0u)
+        << text;  // nothing from the silent one
     const size_t width = text.find('\r', 1) - 1;
     EXPECT_EQ(text.substr(width + 1), "\r" + std::string(width, ' ') + "\r");  // cleared by the destructor
 }
@@ -63,8 +64,9 @@ TEST(RunSummaries, CountRepeatsDropsFillsAndTrims)
                                         "6.00 s of mp4 in 2.5 s (2.4x real time)"}));
     EXPECT_EQ(AudioSummary(audio, true),
               "6.00 s in, 6.00 s out at 44100 Hz mono (0.325 s of gaps filled, 0.195 s of overlap trimmed)");
-    EXPECT_EQ(AudioSummary(audio, false), "6.00 s in, 6.00 s out at 44100 Hz mono (the input has 0.325 s of gaps "
-                                           "and 0.195 s of overlap; --continuous would repair them)");
+    EXPECT_EQ(AudioSummary(audio, false),
+              "6.00 s in, 6.00 s out at 44100 Hz mono (the input has 0.325 s of gaps "
+              "and 0.195 s of overlap; --continuous would repair them)");
     EXPECT_EQ(AudioSummary({6.004, 6.0, 0.0, 0.0, 44100, {6, kFivePointOneSide}, {}}, false),
               "6.00 s in, 6.00 s out at 44100 Hz 5.1");
 }

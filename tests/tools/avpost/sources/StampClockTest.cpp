@@ -13,7 +13,9 @@ TEST(StampClock, MillisecondStampsOfEvenFramesBecomeExactWithoutDrift)
     StampClock clock(10000000.0 / 48000, 10000);
     const std::vector<int64_t> stamps = {0, 210000, 430000, 640000, 850000};
     for (size_t i = 0; i < stamps.size(); ++i)
-        EXPECT_EQ(clock.Next(stamps[i], 1024), static_cast<int64_t>(static_cast<double>(i * 1024) * 10000000.0 / 48000 + 0.5)) << i;
+        EXPECT_EQ(clock.Next(stamps[i], 1024),
+                  static_cast<int64_t>(static_cast<double>(i * 1024) * 10000000.0 / 48000 + 0.5))
+            << i;
 
     // Long runs do not drift.
     StampClock longRun(10000000.0 / 44100, 227);  // one-sample clock of an MP4 audio track
@@ -29,8 +31,8 @@ TEST(StampClock, RealJumpsAndMissingStampsAreHandled)
     StampClock clock(400000.0, 10000);  // 25 pictures per second, 1 ms tolerance
     EXPECT_EQ(clock.Next(1000000, 1), 1000000);
     EXPECT_EQ(clock.Next(StampClock::kNoStamp, 1), 1400000);  // no stamp: where the last one ended
-    EXPECT_EQ(clock.Next(1815000, 1), 1815000);  // more than 1 ms off: a real jump, kept
-    EXPECT_EQ(clock.Next(2210000, 1), 2215000);  // counted from the jump
+    EXPECT_EQ(clock.Next(1815000, 1), 1815000);               // more than 1 ms off: a real jump, kept
+    EXPECT_EQ(clock.Next(2210000, 1), 2215000);               // counted from the jump
     clock.Restart();
     EXPECT_EQ(clock.Next(5000, 1), 5000);
 }
