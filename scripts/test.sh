@@ -1,13 +1,16 @@
 #!/usr/bin/env bash
-# Builds and tests the library four ways: x86-64 (with its Debian packages, and a smoke run of
-# every benchmark), 32-bit x86 (-m32), x86-64 with AddressSanitizer and
-# UndefinedBehaviorSanitizer, and the tests labelled "threads" under ThreadSanitizer, each with
-# every compiler warning an error; then runs every fuzz target briefly over its kept corpus
-# (clang's libFuzzer). Exits non-zero on the first failure.
+# Checks that the sources keep the house format (scripts/format.sh), then builds and tests the
+# library four ways: x86-64 (with its Debian packages, and a smoke run of every benchmark), 32-bit
+# x86 (-m32), x86-64 with AddressSanitizer and UndefinedBehaviorSanitizer, and the tests labelled
+# "threads" under ThreadSanitizer, each with every compiler warning an error; then runs every
+# fuzz target briefly over its kept corpus (clang's libFuzzer). Exits non-zero on the first
+# failure.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
 scripts/install-deps.sh --i386 --bench
+echo "== format =="
+scripts/format.sh --check
 
 jobs=$(nproc)
 build_root=${AVPOST_BUILD_ROOT:-build}
