@@ -14,7 +14,7 @@
 #include "tools/avpost/gallery/ContactSheet.h"
 #include "tools/avpost/gallery/GalleryTiles.h"
 #include "tools/avpost/output/OutputFile.h"
-#include "tools/avpost/output/StandardOutput.h"
+#include "tools/avpost/output/LibraryTraces.h"
 
 namespace avpost::tool {
 namespace {
@@ -65,7 +65,7 @@ void RunGalleryCommand(const Invocation& call)
 {
     const std::string& folder = call.output;
     CheckFolder(folder);
-    DivertLibraryOutput();
+    SilenceLibraryTraces();
     const std::vector<GalleryTile> tiles = GalleryTiles();
     ContactSheet sheet(static_cast<int>(tiles.size()), kTileWidth, kTileHeight, kTitle);
     std::vector<std::unique_ptr<StagedPath>> files;
@@ -80,8 +80,8 @@ void RunGalleryCommand(const Invocation& call)
     for (const std::unique_ptr<StagedPath>& file : files)
         file->Commit();
     if (!call.quiet)
-        std::fprintf(ResultStream(), "avpost gallery: %zu pictures and the contact sheet %s written into %s\n",
-                     tiles.size(), kSheetName, folder.c_str());
+        std::fprintf(stdout, "avpost gallery: %zu pictures and the contact sheet %s written into %s\n", tiles.size(),
+                     kSheetName, folder.c_str());
 }
 
 }  // namespace avpost::tool
