@@ -15,22 +15,23 @@ int ChoiceValue(const std::vector<Choice>& choices, const std::string& text, con
     throw Expected{what};
 }
 
-std::string RangeText(const OptionSpec& spec)
+std::string RangeText(const OptionEntry& entry)
 {
-    return "a whole number from " + std::to_string(spec.low) + " to " + std::to_string(spec.high);
+    return "a whole number from " + std::to_string(entry.low) + " to " + std::to_string(entry.high);
 }
 
 // Items of a timed kind: plain ones make the value outside every stretch (numbers: the last
 // one; choices: all of them), VALUE@FROM-UNTIL ones a stretch each.
-void ReadTimedItems(const OptionSpec& spec, const std::string& text, OptionValue& value)
+void ReadTimedItems(const OptionEntry& entry, const std::string& text, OptionValue& value)
 {
-    const bool whole = spec.kind == ValueKind::TimedWhole;
-    const std::string what = (whole ? RangeText(spec) : "a comma-separated list of " + ChoiceNames(spec.choices)) +
+    const bool whole = entry.kind == ValueKind::TimedWhole;
+    const std::string what = (whole ? RangeText(entry) : "a comma-separated list of " + ChoiceNames(entry.choices)) +
                              ", each may be limited to a time as VALUE@FROM-UNTIL";
     for (const std::string& item : Split(text, ',')) {
         const size_t at = item.find('@');
         const std::string name = item.substr(0, at);
-        const int number = whole ? WholeNumber(name, spec.low, spec.high, what) : ChoiceValue(spec.choices, name, what);
+        const int number =
+            whole ? WholeNumber(name, entry.low, entry.high, what) : ChoiceValue(entry.choices, name, what);
         if (at != std::string::npos)
             value.stretches.push_back({number, ParseTimeRange(item.substr(at + 1))});
         else
@@ -38,24 +39,24 @@ void ReadTimedItems(const OptionSpec& spec, const std::string& text, OptionValue
     }
 }
 
-OptionValue ValueOf(const OptionSpec& spec, const std::string& text)
+OptionValue ValueOf(const OptionEntry& entry, const std::string& text)
 {
     OptionValue value;
     value.text = text;
-    switch (spec.kind) {
+    switch (entry.kind) {
     case ValueKind::Whole:
-        value.number = WholeNumber(text, spec.low, spec.high, RangeText(spec));
+        value.number = WholeNumber(text, entry.low, entry.high, RangeText(entry));
         break;
     case ValueKind::Choice:
-        value.number = ChoiceValue(spec.choices, text, ChoiceNames(spec.choices));
+        value.number = ChoiceValue(entry.choices, text, ChoiceNames(entry.choices));
         break;
     case ValueKind::ChoiceList:
         for (const std::string& name : Split(text, ','))
-            value.number |= ChoiceValue(spec.choices, name, "a comma-separated list of " + ChoiceNames(spec.choices));
+            value.number |= ChoiceValue(entry.choices, name, "a comma-separated list of " + ChoiceNames(entry.choices));
         break;
     case ValueKind::TimedWhole:
     case ValueKind::TimedChoiceList:
-        ReadTimedItems(spec, text, value);
+        ReadTimedItems(entry, text, value);
         break;
     case ValueKind::Switch:
     case ValueKind::Text:
@@ -64,21 +65,21 @@ OptionValue ValueOf(const OptionSpec& spec, const std::string& text)
     return value;
 }
 
-void Apply(const OptionSpec& spec, Invocation& call, const std::string& text)
+void Apply(const OptionEntry& entry, Invocation& call, const std::string& text)
 {
     try {
-        spec.apply(call, ValueOf(spec, text));
+        entry.apply(call, ValueOf(entry, text));
     } catch (const Expected& expected) {
-        Fail(spec.name, "expected " + expected.what + ", got '" + text + "'");
+        Fail(entry.name, "expected " + expected.what + ", got '" + text + "'");
     }
 }
 
 void ApplyDefaults(Invocation& call)
 {
     const unsigned bit = CommandBit(call.command);
-    for (const OptionSpec& spec : OptionTable())
-        if ((spec.commands & bit) != 0 && spec.defaultValue != nullptr)
-            Apply(spec, call, spec.defaultValue);
+    for (const OptionEntry& entry : OptionTable())
+        if ((entry.commands & bit) != 0 && entry.defaultValue != nullptr)
+            Apply(entry, call, entry.defaultValue);
 }
 
 const char* CommandName(unsigned bit)
@@ -97,11 +98,11 @@ const char* CommandName(unsigned bit)
     }
 }
 
-std::string CommandsOf(const OptionSpec& spec)
+std::string CommandsOf(const OptionEntry& entry)
 {
     std::vector<std::string> names;
     for (unsigned bit : {kForDemo, kForVideo, kForAudio, kForConvert, kForGallery})
-        if ((spec.commands & bit) != 0)
+        if ((entry.commands & bit) != 0)
             names.push_back("'avpost " + std::string(CommandName(bit)) + "'");
     std::string text;
     for (size_t i = 0; i < names.size(); ++i)
@@ -141,12 +142,12 @@ size_t ApplyOption(Invocation& call, const std::vector<std::string>& args, size_
         value = name.substr(equals + 1);
         name = name.substr(0, equals);
     }
-    const OptionSpec* spec = FindOption(name);
-    if (spec == nullptr)
+    const OptionEntry* entry = FindOption(name);
+    if (entry == nullptr)
         Fail(name, "unknown option (see avpost --help)");
-    if ((spec->commands & CommandBit(call.command)) == 0)
-        Fail(name, "is an option of " + CommandsOf(*spec));
-    const bool takesValue = spec->kind != ValueKind::Switch;
+    if ((entry->commands & CommandBit(call.command)) == 0)
+        Fail(name, "is an option of " + CommandsOf(*entry));
+    const bool takesValue = entry->kind != ValueKind::Switch;
     size_t used = 1;
     if (takesValue && !inlineValue) {
         if (at + 1 >= args.size())
@@ -156,8 +157,8 @@ size_t ApplyOption(Invocation& call, const std::vector<std::string>& args, size_
     } else if (!takesValue && inlineValue) {
         Fail(name, "takes no value");
     }
-    Apply(*spec, call, value);
-    if (spec->shapesRequest)
+    Apply(*entry, call, value);
+    if (entry->shapesRequest)
         call.video.hasRequest = true;
     return used;
 }

@@ -125,32 +125,32 @@ void AppendWrapped(std::string& text, const std::string& words, size_t indent)
 }
 
 // "(-100 ... 100; default 0)", "(keep, stretch, ... or 4:3; default keep)".
-std::string Bounds(const OptionSpec& spec)
+std::string Bounds(const OptionEntry& entry)
 {
     std::string bounds;
-    if (spec.kind == ValueKind::Whole || spec.kind == ValueKind::TimedWhole)
-        bounds = std::to_string(spec.low) + " ... " + std::to_string(spec.high);
-    else if (spec.kind == ValueKind::Choice || spec.kind == ValueKind::TimedChoiceList)
-        bounds = ChoiceNames(spec.choices);
-    if (spec.defaultValue != nullptr)
-        bounds += (bounds.empty() ? "" : "; ") + std::string("default ") + spec.defaultValue;
-    else if (spec.defaultMeaning != nullptr)
-        bounds += (bounds.empty() ? "" : "; ") + std::string("default: ") + spec.defaultMeaning;
+    if (entry.kind == ValueKind::Whole || entry.kind == ValueKind::TimedWhole)
+        bounds = std::to_string(entry.low) + " ... " + std::to_string(entry.high);
+    else if (entry.kind == ValueKind::Choice || entry.kind == ValueKind::TimedChoiceList)
+        bounds = ChoiceNames(entry.choices);
+    if (entry.defaultValue != nullptr)
+        bounds += (bounds.empty() ? "" : "; ") + std::string("default ") + entry.defaultValue;
+    else if (entry.defaultMeaning != nullptr)
+        bounds += (bounds.empty() ? "" : "; ") + std::string("default: ") + entry.defaultMeaning;
     return bounds.empty() ? "" : "(" + bounds + ")";
 }
 
-std::string OptionLine(const OptionSpec& spec, const std::string& indent)
+std::string OptionLine(const OptionEntry& entry, const std::string& indent)
 {
-    std::string line = indent + (spec.alias != nullptr ? std::string(spec.alias) + ", " : "") + spec.name;
-    if (spec.placeholder != nullptr)
-        line += std::string(" ") + spec.placeholder;
+    std::string line = indent + (entry.alias != nullptr ? std::string(entry.alias) + ", " : "") + entry.name;
+    if (entry.placeholder != nullptr)
+        line += std::string(" ") + entry.placeholder;
     line += line.size() + 2 <= kTextColumn ? std::string(kTextColumn - line.size(), ' ')
                                            : "\n" + std::string(kTextColumn, ' ');
-    AppendWrapped(line, std::string(spec.help) + " " + Bounds(spec), kTextColumn);
+    AppendWrapped(line, std::string(entry.help) + " " + Bounds(entry), kTextColumn);
     return line + "\n";
 }
 
-bool IsGeneral(const OptionSpec& spec) { return spec.commands == (kForDemo | kForVideo | kForAudio | kForConvert); }
+bool IsGeneral(const OptionEntry& entry) { return entry.commands == (kForDemo | kForVideo | kForAudio | kForConvert); }
 
 // The options of a command, under their headings; the general ones are listed once, in the
 // overview.
@@ -158,14 +158,14 @@ std::string OptionList(unsigned command)
 {
     std::string text;
     const char* group = nullptr;
-    for (const OptionSpec& spec : OptionTable()) {
-        if ((spec.commands & command) == 0 || IsGeneral(spec))
+    for (const OptionEntry& entry : OptionTable()) {
+        if ((entry.commands & command) == 0 || IsGeneral(entry))
             continue;
-        if (group == nullptr || std::string(group) != spec.group) {
-            group = spec.group;
+        if (group == nullptr || std::string(group) != entry.group) {
+            group = entry.group;
             text += std::string("  ") + group + ":\n";
         }
-        text += OptionLine(spec, "    ");
+        text += OptionLine(entry, "    ");
     }
     return text;
 }
@@ -173,9 +173,9 @@ std::string OptionList(unsigned command)
 std::string Overview()
 {
     std::string general = "General options:\n";
-    for (const OptionSpec& spec : OptionTable())
-        if (IsGeneral(spec))
-            general += OptionLine(spec, "  ");
+    for (const OptionEntry& entry : OptionTable())
+        if (IsGeneral(entry))
+            general += OptionLine(entry, "  ");
     general += "  --version" + std::string(kTextColumn - 11, ' ') + "the version\n";
     std::string text = kOverview;
     return text.replace(text.find("@GENERAL@\n"), 10, general);

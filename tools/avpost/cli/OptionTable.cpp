@@ -29,7 +29,7 @@ void SetWatermarkPlace(Invocation& call, const OptionValue& value)
     mark.hasRect = true;
 }
 
-std::vector<OptionSpec> MakeTable()
+std::vector<OptionEntry> MakeTable()
 {
     const unsigned kAll = kForDemo | kForVideo | kForAudio | kForConvert | kForGallery;
     const unsigned kPictures = kForVideo | kForConvert;
@@ -48,7 +48,7 @@ std::vector<OptionSpec> MakeTable()
     const ValueKind kChoice = ValueKind::Choice;
     const ValueKind kText = ValueKind::Text;
     const ValueKind kTimedWhole = ValueKind::TimedWhole;
-    // One option per entry, its fields in the order of OptionSpec, laid out by hand.
+    // One option per entry, its fields in the order of OptionEntry, laid out by hand.
     // clang-format off
     return {
         {"--help", "-h", nullptr, kAll, kSwitch, 0, 0, {}, nullptr, nullptr, false, kGeneral,
@@ -251,17 +251,17 @@ std::vector<OptionSpec> MakeTable()
 
 const std::vector<Choice>& WatermarkPlaces() { return kPlaces; }
 
-const std::vector<OptionSpec>& OptionTable()
+const std::vector<OptionEntry>& OptionTable()
 {
-    static const std::vector<OptionSpec> table = MakeTable();
+    static const std::vector<OptionEntry> table = MakeTable();
     return table;
 }
 
-const OptionSpec* FindOption(const std::string& name)
+const OptionEntry* FindOption(const std::string& name)
 {
-    for (const OptionSpec& spec : OptionTable())
-        if (name == spec.name || (spec.alias != nullptr && name == spec.alias))
-            return &spec;
+    for (const OptionEntry& entry : OptionTable())
+        if (name == entry.name || (entry.alias != nullptr && name == entry.alias))
+            return &entry;
     return nullptr;
 }
 

@@ -46,7 +46,7 @@ struct OptionValue {
     Timed timed() const { return {number, stretches}; }
 };
 
-struct OptionSpec {
+struct OptionEntry {
     const char* name;         // "--size"
     const char* alias;        // "-q", or nullptr
     const char* placeholder;  // "WxH" in the help; nullptr for a switch
@@ -66,13 +66,13 @@ struct OptionSpec {
     void (*apply)(Invocation& call, const OptionValue& value);
 };
 
-const std::vector<OptionSpec>& OptionTable();
+const std::vector<OptionEntry>& OptionTable();
 
 // The names --watermark-pos takes for the nine places, with their alignment codes.
 const std::vector<Choice>& WatermarkPlaces();
 
-// The spec of a name or alias; nullptr when there is none.
-const OptionSpec* FindOption(const std::string& name);
+// The entry of a name or alias; nullptr when there is none.
+const OptionEntry* FindOption(const std::string& name);
 
 // "a, b or c": the names of choices as the help and the error messages list them.
 std::string ChoiceNames(const std::vector<Choice>& choices);

@@ -262,19 +262,19 @@ TEST(CommandLine, BadInputIsNamedWithWhatWasExpected)
 TEST(CommandLine, HelpComesFromTheOptionTableAndItsExamplesParse)
 {
     const std::string help = HelpText("");
-    for (const OptionSpec& spec : OptionTable()) {
-        const std::string topic = (spec.commands & kForVideo) != 0   ? "video"
-                                  : (spec.commands & kForAudio) != 0 ? "audio"
-                                                                     : "convert";
-        const std::string part = (spec.commands & kForDemo) != 0 ? help : HelpText(topic);
-        EXPECT_NE(part.find(std::string(spec.name) + " "), std::string::npos) << spec.name;
-        if (spec.defaultValue != nullptr) {
-            EXPECT_NE(part.find(std::string("default ") + spec.defaultValue), std::string::npos) << spec.name;
+    for (const OptionEntry& entry : OptionTable()) {
+        const std::string topic = (entry.commands & kForVideo) != 0   ? "video"
+                                  : (entry.commands & kForAudio) != 0 ? "audio"
+                                                                      : "convert";
+        const std::string part = (entry.commands & kForDemo) != 0 ? help : HelpText(topic);
+        EXPECT_NE(part.find(std::string(entry.name) + " "), std::string::npos) << entry.name;
+        if (entry.defaultValue != nullptr) {
+            EXPECT_NE(part.find(std::string("default ") + entry.defaultValue), std::string::npos) << entry.name;
             // A default is a value like any other: the table cannot hold one its own parser refuses.
-            EXPECT_NO_THROW(Parse({topic, "in", "out", spec.name, spec.defaultValue})) << spec.name;
+            EXPECT_NO_THROW(Parse({topic, "in", "out", entry.name, entry.defaultValue})) << entry.name;
         }
-        for (const Choice& choice : spec.choices)
-            EXPECT_NE(part.find(choice.name), std::string::npos) << spec.name << " " << choice.name;
+        for (const Choice& choice : entry.choices)
+            EXPECT_NE(part.find(choice.name), std::string::npos) << entry.name << " " << choice.name;
     }
     for (const char* topic : {"demo", "video", "audio", "convert", "gallery"}) {
         EXPECT_NE(help.find(HelpText(topic)), std::string::npos) << topic;  // the whole help holds each topic's
