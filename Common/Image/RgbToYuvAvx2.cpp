@@ -201,6 +201,8 @@ int TableBlocks(const RgbBlockRows& rows, int evenWidth)
     int c = 0;
     for (; c + 32 <= evenWidth; c += 32) {
         __m256i y0[2], y1[2], u[2], v[2];
+        // Unrolled, so that the halves' results stay in registers instead of going through memory.
+#pragma GCC unroll 2
         for (int half = 0; half < 2; ++half) {
             const int column = c + 16 * half;
             const RowValues r0 = ConvertRow(src0 + column * bytes, bytes, highSkip, s, k, false);
@@ -244,6 +246,8 @@ int Rgb24SimpleBlocksAvx2(const RgbBlockRows& rows, int evenWidth)
     int c = 0;
     for (; c + 32 <= evenWidth; c += 32) {
         __m256i y0[2], y1[2], u[2], v[2];
+        // Unrolled, so that the halves' results stay in registers instead of going through memory.
+#pragma GCC unroll 2
         for (int half = 0; half < 2; ++half) {
             const int column = c + 16 * half;
             const RowValues r0 = ConvertRow(rows.src0 + column * 3, 3, 4, s, k, true);
